@@ -1,0 +1,8 @@
+#pragma once
+// KVData: client-side data library for keeping colour-measuring instruments
+// in calibration. This header includes every public header.
+//
+//   #include <kvdata/kvdata.hpp>
+//   auto user = kvdata::CreateObject(u"KVData.KVUser");
+
+#include "kvdata/automation.hpp"

@@ -1,0 +1,24 @@
+// The table of creatable classes, one line per class, in the order in which
+// the library lists them. Interface classes and facades are not creatable.
+#include "kvdata/automation/create_object.hpp"
+
+namespace kvdata {
+namespace {
+
+template <class T>
+std::shared_ptr<Object> make() {
+  return T::create();
+}
+
+// Filled as the classes are added: {u"KVData.KVUser", &make<KVUser>}, ...
+constexpr CreatableClass kClasses[] = {
+    {u"", nullptr},
+};
+
+}  // namespace
+
+std::span<const CreatableClass> CreatableClasses() {
+  return std::span<const CreatableClass>(kClasses).subspan(1);
+}
+
+}  // namespace kvdata
