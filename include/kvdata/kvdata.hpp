@@ -6,3 +6,4 @@
 //   auto user = kvdata::CreateObject(u"KVData.KVUser");
 
 #include "kvdata/automation.hpp"
+#include "kvdata/foundation.hpp"

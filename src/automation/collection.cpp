@@ -15,7 +15,9 @@ void Collection::Add(Variant item, const String& key) {
   entries_.push_back(Entry{std::move(item), key});
 }
 
-bool Collection::Contains(const String& key) const { return by_key_.contains(to_upper(key)); }
+bool Collection::Contains(const String& key) const {
+  return by_key_.contains(to_upper(key));
+}
 
 std::size_t Collection::locate(const Variant& index_or_key) const {
   if (const String* key = index_or_key.get_if<String>()) {
@@ -31,7 +33,9 @@ std::size_t Collection::locate(const Variant& index_or_key) const {
   return static_cast<std::size_t>(position - 1);
 }
 
-Variant& Collection::Item(const Variant& index_or_key) { return entries_[locate(index_or_key)].item; }
+Variant& Collection::Item(const Variant& index_or_key) {
+  return entries_[locate(index_or_key)].item;
+}
 
 const Variant& Collection::Item(const Variant& index_or_key) const {
   return entries_[locate(index_or_key)].item;

@@ -14,16 +14,26 @@ Error::Error(Long number, String source, String description)
 
 String standard_description(Long number) {
   switch (number) {
-    case kInvalidProcedureCall: return u"Invalid procedure call or argument";
-    case kOverflow: return u"Overflow";
-    case kOutOfMemory: return u"Out of memory";
-    case kSubscriptOutOfRange: return u"Subscript out of range";
-    case kTypeMismatch: return u"Type mismatch";
-    case kObjectNotSet: return u"Object variable or With block variable not set";
-    case kInvalidUseOfNull: return u"Invalid use of Null";
-    case kCannotCreateObject: return u"Cannot create object";
-    case kDuplicateKey: return u"This key is already associated with an element of this collection";
-    default: return u"Application-defined or object-defined error";
+    case kInvalidProcedureCall:
+      return u"Invalid procedure call or argument";
+    case kOverflow:
+      return u"Overflow";
+    case kOutOfMemory:
+      return u"Out of memory";
+    case kSubscriptOutOfRange:
+      return u"Subscript out of range";
+    case kTypeMismatch:
+      return u"Type mismatch";
+    case kObjectNotSet:
+      return u"Object variable or With block variable not set";
+    case kInvalidUseOfNull:
+      return u"Invalid use of Null";
+    case kCannotCreateObject:
+      return u"Cannot create object";
+    case kDuplicateKey:
+      return u"This key is already associated with an element of this collection";
+    default:
+      return u"Application-defined or object-defined error";
   }
 }
 

@@ -31,6 +31,8 @@ void EventLog::Write(const String& text) {
   }
 }
 
-EventLog::Sink EventLog::SetSink(Sink sink) { return std::exchange(current_sink(), std::move(sink)); }
+EventLog::Sink EventLog::SetSink(Sink sink) {
+  return std::exchange(current_sink(), std::move(sink));
+}
 
 }  // namespace kvdata

@@ -72,9 +72,7 @@ class Array {
   const_iterator end() const { return items_.end(); }
 
   // True when the array is one-dimensional and `i` lies within its bounds.
-  bool contains(Long i) const {
-    return rank_ == 1 && i >= dims_[0].lower && i <= dims_[0].upper;
-  }
+  bool contains(Long i) const { return rank_ == 1 && i >= dims_[0].lower && i <= dims_[0].upper; }
 
   // Checked access with the array's own indices; error 9 outside the bounds
   // or on an array of another rank.
@@ -151,7 +149,8 @@ class Array {
   friend bool operator==(const Array& a, const Array& b) {
     if (a.rank_ != b.rank_) return false;
     for (int d = 0; d < a.rank_; ++d) {
-      if (!(a.dims_[static_cast<std::size_t>(d)] == b.dims_[static_cast<std::size_t>(d)])) return false;
+      if (!(a.dims_[static_cast<std::size_t>(d)] == b.dims_[static_cast<std::size_t>(d)]))
+        return false;
     }
     return a.items_ == b.items_;
   }
@@ -190,7 +189,8 @@ class Array {
         j > dims_[1].upper) {
       raise(kSubscriptOutOfRange);
     }
-    const auto rows = static_cast<std::size_t>(static_cast<long long>(dims_[0].upper) - dims_[0].lower + 1);
+    const auto rows =
+        static_cast<std::size_t>(static_cast<long long>(dims_[0].upper) - dims_[0].lower + 1);
     return static_cast<std::size_t>(static_cast<long long>(i) - dims_[0].lower) +
            rows * static_cast<std::size_t>(static_cast<long long>(j) - dims_[1].lower);
   }
@@ -222,15 +222,10 @@ class FixedArray {
   T& operator()(Long i) { return items_[offset(i)]; }
   const T& operator()(Long i) const { return items_[offset(i)]; }
   template <class E>
-    requires std::is_enum_v<E>
-  T& operator()(E e) {
-    return (*this)(static_cast<Long>(e));
-  }
+  requires std::is_enum_v<E> T& operator()(E e) { return (*this)(static_cast<Long>(e)); }
   template <class E>
-    requires std::is_enum_v<E>
-  const T& operator()(E e) const {
-    return (*this)(static_cast<Long>(e));
-  }
+  requires std::is_enum_v<E>
+  const T& operator()(E e) const { return (*this)(static_cast<Long>(e)); }
 
   T* data() { return items_.data(); }
   const T* data() const { return items_.data(); }

@@ -87,6 +87,8 @@ class Collection::const_iterator {
 inline Collection::const_iterator Collection::begin() const {
   return const_iterator(entries_.begin());
 }
-inline Collection::const_iterator Collection::end() const { return const_iterator(entries_.end()); }
+inline Collection::const_iterator Collection::end() const {
+  return const_iterator(entries_.end());
+}
 
 }  // namespace kvdata

@@ -10,12 +10,12 @@
 
 namespace kvdata {
 
-using Integer = std::int16_t;  // signed 16-bit
-using Long = std::int32_t;     // signed 32-bit
-using Single = float;          // IEEE 754 binary32
-using Double = double;         // IEEE 754 binary64
-using Byte = std::uint8_t;     // unsigned 8-bit
-using String = std::u16string; // UTF-16 text; empty and null behave alike
+using Integer = std::int16_t;   // signed 16-bit
+using Long = std::int32_t;      // signed 32-bit
+using Single = float;           // IEEE 754 binary32
+using Double = double;          // IEEE 754 binary64
+using Byte = std::uint8_t;      // unsigned 8-bit
+using String = std::u16string;  // UTF-16 text; empty and null behave alike
 
 static_assert(sizeof(Single) == 4 && sizeof(Double) == 8);
 

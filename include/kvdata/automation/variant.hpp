@@ -66,7 +66,9 @@ template <class T>
 class RecordBox final : public RecordHolder {
  public:
   explicit RecordBox(T v) : value(std::move(v)) {}
-  std::unique_ptr<RecordHolder> clone() const override { return std::make_unique<RecordBox>(value); }
+  std::unique_ptr<RecordHolder> clone() const override {
+    return std::make_unique<RecordBox>(value);
+  }
   std::u16string_view type_name() const override { return RecordTraits<T>::kTypeName; }
   const std::type_info& type() const override { return typeid(T); }
   bool equals(const RecordHolder& other) const override {
@@ -140,8 +142,8 @@ class Variant {
   Variant(bool v) : value_(v) {}
   Variant(Byte v) : value_(v) {}
   template <class T>
-    requires std::is_base_of_v<Object, T>
-  Variant(std::shared_ptr<T> v) : value_(ObjectRef(std::move(v))) {}
+  requires std::is_base_of_v<Object, T> Variant(std::shared_ptr<T> v)
+      : value_(ObjectRef(std::move(v))) {}
   Variant(Array<Variant> v) : value_(detail::DeepBox<Array<Variant>>(std::move(v))) {}
   Variant(Array<Byte> v) : value_(std::move(v)) {}
   Variant(Array<Integer> v) : value_(std::move(v)) {}
