@@ -1,0 +1,5 @@
+#pragma once
+// The domain objects: users, tolerances and tolerance sets.
+
+#include "kvdata/objects/kv_tol_set.hpp"
+#include "kvdata/objects/kv_tolerance.hpp"
