@@ -3,6 +3,7 @@
 #include "kvdata/automation/create_object.hpp"
 #include "kvdata/objects/kv_tol_set.hpp"
 #include "kvdata/objects/kv_tolerance.hpp"
+#include "kvdata/objects/kv_user.hpp"
 
 namespace kvdata {
 namespace {
@@ -13,12 +14,15 @@ std::shared_ptr<Object> make() {
 }
 
 constexpr CreatableClass kClasses[] = {
+    {u"KVData.KVUser", &make<KVUser>},
     {u"KVData.KVTolerance", &make<KVTolerance>},
     {u"KVData.KVTolSet", &make<KVTolSet>},
 };
 
 }  // namespace
 
-std::span<const CreatableClass> CreatableClasses() { return kClasses; }
+std::span<const CreatableClass> CreatableClasses() {
+  return kClasses;
+}
 
 }  // namespace kvdata

@@ -30,7 +30,9 @@ constexpr char16_t kMissingName[] = u"MISSING";
 constexpr char16_t kMissingDescription[] = u"Missing Tolerance ";
 
 // A member's key as the stream rebuilds it: its ID in decimal.
-String id_key(Long id) { return Variant(id).to_string(); }
+String id_key(Long id) {
+  return Variant(id).to_string();
+}
 
 // Capacity for one more element (growing geometrically), so that the
 // push_back that follows cannot fail.
@@ -41,14 +43,24 @@ void make_room(std::vector<T>& v) {
 
 }  // namespace
 
-std::shared_ptr<KVTolSet> KVTolSet::create() { return std::make_shared<KVTolSet>(); }
+std::shared_ptr<KVTolSet> KVTolSet::create() {
+  return std::make_shared<KVTolSet>();
+}
 
 KVTolSet::KVTolSet() : placeholder_(KVTolerance::create()) {}
 
-String KVTolSet::IKVObj_ObjType() const { return u"TolSet"; }
-String KVTolSet::IKVObj_Description() const { return u"Tolerance Set"; }
-Variant KVTolSet::IKVObj_ID() const { return Variant(IKVTolSet_InstTypeID()); }
-Variant KVTolSet::IKVObj_DateCreated() const { return Variant(IKVTolSet_CreateDate()); }
+String KVTolSet::IKVObj_ObjType() const {
+  return u"TolSet";
+}
+String KVTolSet::IKVObj_Description() const {
+  return u"Tolerance Set";
+}
+Variant KVTolSet::IKVObj_ID() const {
+  return Variant(IKVTolSet_InstTypeID());
+}
+Variant KVTolSet::IKVObj_DateCreated() const {
+  return Variant(IKVTolSet_CreateDate());
+}
 
 Long KVTolSet::IKVTolSet_InstTypeID() const {
   return detail::get_field<Long>(header_, kInstTypeIdOffset);
@@ -67,8 +79,12 @@ void KVTolSet::IKVTolSet_Description_Set(const Variant& value) {
   IKVTolSet_Description_Let(value);
 }
 
-Long KVTolSet::IKVTolSet_ID() const { return detail::get_field<Long>(header_, kIdOffset); }
-void KVTolSet::IKVTolSet_ID(Long value) { detail::set_field(header_, kIdOffset, value); }
+Long KVTolSet::IKVTolSet_ID() const {
+  return detail::get_field<Long>(header_, kIdOffset);
+}
+void KVTolSet::IKVTolSet_ID(Long value) {
+  detail::set_field(header_, kIdOffset, value);
+}
 
 Date KVTolSet::IKVTolSet_CreateDate() const {
   return detail::get_field<Date>(header_, kCreateDateOffset);
@@ -106,7 +122,9 @@ std::shared_ptr<IKVTolerance> KVTolSet::IKVTolSet_Item(const Variant& vntIndexKe
   return placeholder_;
 }
 
-Long KVTolSet::IKVTolSet_count() const { return static_cast<Long>(members_.size()); }
+Long KVTolSet::IKVTolSet_count() const {
+  return static_cast<Long>(members_.size());
+}
 
 void KVTolSet::IKVTolSet_Remove(const Variant& vntIndexKey) {
   const String key = vntIndexKey.to_string();

@@ -38,7 +38,9 @@ constexpr std::u16string_view kStepCopy = u"copying tolerance to stream";
 
 }  // namespace
 
-std::shared_ptr<KVTolerance> KVTolerance::create() { return std::make_shared<KVTolerance>(); }
+std::shared_ptr<KVTolerance> KVTolerance::create() {
+  return std::make_shared<KVTolerance>();
+}
 
 bool KVTolerance::IKVStream_StreamOut(ByteArray& bytStream, Long& Position) {
   std::u16string_view step = kStepConvert;
@@ -68,10 +70,16 @@ bool KVTolerance::IKVStream_StreamIn(const ByteArray& bytStream, Long& Position)
   return true;
 }
 
-Long KVTolerance::IKVStream_StreamLen() const { return static_cast<Long>(kRecordBytes); }
+Long KVTolerance::IKVStream_StreamLen() const {
+  return static_cast<Long>(kRecordBytes);
+}
 
-Long KVTolerance::IKVTolerance_ID() const { return detail::get_field<Long>(record_, kIdOffset); }
-void KVTolerance::IKVTolerance_ID(Long value) { detail::set_field(record_, kIdOffset, value); }
+Long KVTolerance::IKVTolerance_ID() const {
+  return detail::get_field<Long>(record_, kIdOffset);
+}
+void KVTolerance::IKVTolerance_ID(Long value) {
+  detail::set_field(record_, kIdOffset, value);
+}
 
 String KVTolerance::IKVTolerance_TolName() const {
   return detail::get_text_field(record_, kTolNameOffset, kTolNameUnits);

@@ -262,8 +262,9 @@ TEST(KVTolSet, AddAndRemoveRaiseToTheCaller) {
   const auto members = s.NewEnum();
   s.Remove(Variant(u"5"));
   ASSERT_EQ(members->Count(), 4);
-  EXPECT_EQ(kvdata::query<IKVTolerance>(members->Item(Variant(Long{1})).get<Variant::ObjectRef>())->ID(),
-            5);
+  EXPECT_EQ(
+      kvdata::query<IKVTolerance>(members->Item(Variant(Long{1})).get<Variant::ObjectRef>())->ID(),
+      5);
 }
 
 TEST(KVTolSet, IdentityAndInertInterfaces) {

@@ -104,7 +104,7 @@ class KVTolSet final : public InertDBObject,
 
   std::array<Byte, kHeaderBytes> header_{};
   std::vector<std::shared_ptr<IKVTolerance>> members_;
-  std::vector<String> keys_;                            // folded key per member, empty when none
+  std::vector<String> keys_;                           // folded key per member, empty when none
   std::unordered_map<String, std::size_t> positions_;  // folded key -> index in members_
   std::shared_ptr<KVTolerance> placeholder_;
 };

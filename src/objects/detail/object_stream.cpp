@@ -25,7 +25,9 @@ Long writer_upper_bound(const ByteArray& stream) {
   return stream.has_bounds() ? stream.ubound() : -1;
 }
 
-void resize_stream(ByteArray& stream, Long upper) { stream.redim_preserve(0, upper); }
+void resize_stream(ByteArray& stream, Long upper) {
+  stream.redim_preserve(0, upper);
+}
 
 void grow_stream(ByteArray& stream, Long upper) {
   if (writer_upper_bound(stream) < upper) resize_stream(stream, upper);
@@ -35,8 +37,8 @@ bool put_block(ByteArray& stream, Long& position, std::span<const Byte> block) {
   if (!ends_in_range(position, block.size())) return false;
   const auto target = window(stream, position, block.size());
   if (!target || !store_bytes(*target, 0, block)) return false;
-  position = static_cast<Long>(static_cast<long long>(position) +
-                               static_cast<long long>(block.size()));
+  position =
+      static_cast<Long>(static_cast<long long>(position) + static_cast<long long>(block.size()));
   return true;
 }
 

@@ -4,8 +4,9 @@
 // a raw block between a byte stream and a buffer. Bounds and the array's lower
 // bound are handled by the little-endian reader and writer underneath.
 //
-//   const kvdata::Long end = kvdata::detail::index_after(pos, 749);   // error 6 past the Long range
-//   kvdata::detail::grow_stream(bytes, end);  bool ok = kvdata::detail::put_block(bytes, pos, block);
+//   const kvdata::Long end = kvdata::detail::index_after(pos, 749);   // error 6 past the Long
+//   range kvdata::detail::grow_stream(bytes, end);  bool ok = kvdata::detail::put_block(bytes, pos,
+//   block);
 
 #include <cstddef>
 #include <span>
