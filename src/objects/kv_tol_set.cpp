@@ -130,13 +130,16 @@ void KVTolSet::IKVTolSet_Remove(const Variant& vntIndexKey) {
   const String key = vntIndexKey.to_string();
   const auto found = positions_.find(to_upper(key));
   if (found == positions_.end()) raise(kInvalidProcedureCall);
-  const auto at = static_cast<std::ptrdiff_t>(found->second);
-  members_.erase(members_.begin() + at);
-  keys_.erase(keys_.begin() + at);
-  positions_.clear();
+  // The later members move up by one: their positions are rebuilt first, so
+  // that a failure leaves the set as it was.
+  const std::size_t at = found->second;
+  std::unordered_map<String, std::size_t> positions;
   for (std::size_t i = 0; i < keys_.size(); ++i) {
-    if (!keys_[i].empty()) positions_.emplace(keys_[i], i);
+    if (i != at && !keys_[i].empty()) positions.emplace(keys_[i], i < at ? i : i - 1);
   }
+  members_.erase(members_.begin() + static_cast<std::ptrdiff_t>(at));
+  keys_.erase(keys_.begin() + static_cast<std::ptrdiff_t>(at));
+  positions_.swap(positions);
 }
 
 std::shared_ptr<Collection> KVTolSet::IKVTolSet_NewEnum() const {
