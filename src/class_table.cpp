@@ -1,6 +1,7 @@
 // The table of creatable classes, one line per class, in the order in which
 // the library lists them. Interface classes and facades are not creatable.
 #include "kvdata/automation/create_object.hpp"
+#include "kvdata/streams/streams.hpp"
 
 namespace kvdata {
 namespace {
@@ -12,13 +13,13 @@ std::shared_ptr<Object> make() {
 
 // Filled as the classes are added: {u"KVData.KVUser", &make<KVUser>}, ...
 constexpr CreatableClass kClasses[] = {
-    {u"", nullptr},
+    {u"KVData.Streams", &make<Streams>},
 };
 
 }  // namespace
 
 std::span<const CreatableClass> CreatableClasses() {
-  return std::span<const CreatableClass>(kClasses).subspan(1);
+  return std::span<const CreatableClass>(kClasses);
 }
 
 }  // namespace kvdata
