@@ -4,6 +4,7 @@
 #include "kvdata/objects/kv_tol_set.hpp"
 #include "kvdata/objects/kv_tolerance.hpp"
 #include "kvdata/objects/kv_user.hpp"
+#include "kvdata/streams/streams.hpp"
 
 namespace kvdata {
 namespace {
@@ -17,12 +18,11 @@ constexpr CreatableClass kClasses[] = {
     {u"KVData.KVUser", &make<KVUser>},
     {u"KVData.KVTolerance", &make<KVTolerance>},
     {u"KVData.KVTolSet", &make<KVTolSet>},
+    {u"KVData.Streams", &make<Streams>},
 };
 
 }  // namespace
 
-std::span<const CreatableClass> CreatableClasses() {
-  return kClasses;
-}
+std::span<const CreatableClass> CreatableClasses() { return kClasses; }
 
 }  // namespace kvdata

@@ -8,3 +8,4 @@
 #include "kvdata/automation.hpp"
 #include "kvdata/foundation.hpp"
 #include "kvdata/objects.hpp"
+#include "kvdata/streams.hpp"
