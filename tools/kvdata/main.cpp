@@ -22,6 +22,8 @@ int main(int argc, char** argv) {
   CLI::App app{"kvdata: inspect, convert, compute and plot KVData streams and measurements"};
   app.require_subcommand(1);
   app.footer("Run 'kvdata SUBCOMMAND --help' for the options and an example of each.");
+  add_decode(app);
+  add_encode(app);
   add_explain(app);
 
   try {

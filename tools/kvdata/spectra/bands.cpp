@@ -62,9 +62,9 @@ std::vector<tSpectrum> to_bands(const SpectraTable& table, bool extend) {
     inner_gap = inner_gap || (first != 0 && band > first && band < last);
   }
   if (!missing.empty() && (!extend || inner_gap || first == 0)) {
-    std::string message = table.file + ": the spectra cover " + coverage(table.wavelengths) +
-                          "; the 40 bands from 360 to 750 nm at 10 nm are needed (missing: " +
-                          missing + " nm).";
+    std::string message =
+        table.file + ": the spectra cover " + coverage(table.wavelengths) +
+        "; the 40 bands from 360 to 750 nm at 10 nm are needed (missing: " + missing + " nm).";
     if (inner_gap || first == 0) {
       message += " Bands missing inside the range cannot be filled.";
     } else {

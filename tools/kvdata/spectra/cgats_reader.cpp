@@ -57,8 +57,9 @@ SpectraTable read_cgats(const std::string& path) {
     }
   }
   if (spectral.empty()) {
-    bad_input(path + ": no spectral fields in BEGIN_DATA_FORMAT (expected names such as "
-                     "SPECTRAL_NM360)");
+    bad_input(path +
+              ": no spectral fields in BEGIN_DATA_FORMAT (expected names such as "
+              "SPECTRAL_NM360)");
   }
   if (name_field < 0) name_field = id_field;
 

@@ -11,11 +11,12 @@ std::string write_cgats(const std::string& descriptor, const std::vector<std::st
   It8Handle it8(context.get() == nullptr ? nullptr : cmsIT8Alloc(context.get()));
   auto fail = [&] { bad_input("cannot write CGATS: " + context.messages()); };
   if (!it8) fail();
-  bool ok = cmsIT8SetSheetType(it8.get(), "CGATS.17") &&
-            cmsIT8SetPropertyStr(it8.get(), "ORIGINATOR", "kvdata") &&
-            cmsIT8SetPropertyStr(it8.get(), "DESCRIPTOR", descriptor.c_str()) &&
-            cmsIT8SetPropertyDbl(it8.get(), "NUMBER_OF_FIELDS", static_cast<double>(fields.size())) &&
-            cmsIT8SetPropertyDbl(it8.get(), "NUMBER_OF_SETS", static_cast<double>(rows.size()));
+  bool ok =
+      cmsIT8SetSheetType(it8.get(), "CGATS.17") &&
+      cmsIT8SetPropertyStr(it8.get(), "ORIGINATOR", "kvdata") &&
+      cmsIT8SetPropertyStr(it8.get(), "DESCRIPTOR", descriptor.c_str()) &&
+      cmsIT8SetPropertyDbl(it8.get(), "NUMBER_OF_FIELDS", static_cast<double>(fields.size())) &&
+      cmsIT8SetPropertyDbl(it8.get(), "NUMBER_OF_SETS", static_cast<double>(rows.size()));
   for (std::size_t f = 0; ok && f < fields.size(); ++f) {
     ok = cmsIT8SetDataFormat(it8.get(), static_cast<int>(f), fields[f].c_str());
   }

@@ -34,7 +34,8 @@ std::vector<Line> split(const std::string& path, const std::string& text, char s
   auto end_line = [&] {
     end_cell();
     const bool blank = current.cells.size() == 1 && current.cells[0].empty();
-    const bool comment = !current.cells.empty() && !current.cells[0].empty() && current.cells[0][0] == '#';
+    const bool comment =
+        !current.cells.empty() && !current.cells[0].empty() && current.cells[0][0] == '#';
     if (!blank && !comment) lines.push_back(std::move(current));
     current = Line{};
     any = false;
@@ -67,7 +68,8 @@ std::vector<Line> split(const std::string& path, const std::string& text, char s
       cell += c;
     }
   }
-  if (quoted) bad_input(path + " line " + std::to_string(current.number) + ": a quoted cell is not closed");
+  if (quoted)
+    bad_input(path + " line " + std::to_string(current.number) + ": a quoted cell is not closed");
   if (any) end_line();
   return lines;
 }
@@ -118,7 +120,8 @@ SpectraTable read_csv(const std::string& path, const std::string& text) {
   std::vector<std::size_t> spectral;
   std::optional<std::size_t> name_column;
   int name_rank = 99;
-  constexpr const char* kNameColumns[] = {"SAMPLE_NAME", "SAMPLE_ID", "NAME", "SAMPLE", "ID", "LABEL"};
+  constexpr const char* kNameColumns[] = {"SAMPLE_NAME", "SAMPLE_ID", "NAME",
+                                          "SAMPLE",      "ID",        "LABEL"};
   for (std::size_t c = 0; c < header.cells.size(); ++c) {
     const std::string title = trim(header.cells[c]);
     const double nm = wavelength_of(title);

@@ -24,8 +24,8 @@ std::string SpectraTable::label(const SpectrumRow& row) const {
 double wavelength_of(const std::string& column) {
   // Letters, blanks and underscores, then the number, then an optional "nm".
   std::size_t i = 0;
-  while (i < column.size() &&
-         (std::isalpha(static_cast<unsigned char>(column[i])) || column[i] == '_' || column[i] == ' ')) {
+  while (i < column.size() && (std::isalpha(static_cast<unsigned char>(column[i])) ||
+                               column[i] == '_' || column[i] == ' ')) {
     ++i;
   }
   if (i == column.size() || !std::isdigit(static_cast<unsigned char>(column[i]))) return -1;

@@ -13,9 +13,9 @@
 namespace kvdata::cli {
 
 struct SpectrumRow {
-  std::string name;           // sample name, or empty when the file has none
-  std::size_t place = 0;      // CSV: line number; CGATS: set number (1-based)
-  std::vector<double> values; // one per wavelength, in the order of `wavelengths`
+  std::string name;            // sample name, or empty when the file has none
+  std::size_t place = 0;       // CSV: line number; CGATS: set number (1-based)
+  std::vector<double> values;  // one per wavelength, in the order of `wavelengths`
 };
 
 struct SpectraTable {

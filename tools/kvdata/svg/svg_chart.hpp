@@ -23,8 +23,8 @@ class SvgChart {
   SvgChart(std::string title, std::string x_label, std::string y_label);
 
   // Adds a line to the group `series` (created on first use, in order).
-  void add_line(const std::string& series, const std::string& colour,
-                std::vector<Point> points, bool dashed = false);
+  void add_line(const std::string& series, const std::string& colour, std::vector<Point> points,
+                bool dashed = false);
   // Adds a filled band between `low` and `high` (same x values) to the group.
   void add_band(const std::string& series, const std::string& colour, std::vector<Point> low,
                 std::vector<Point> high);

@@ -93,7 +93,7 @@ void walk_tolset(Cursor& c, Walk& w) {
     }
   }
   finish(c, 1, false, "tolerance set");
-  set_evidence(w, Evidence::Structure, "its member count and length agree");
+  set_evidence(w, Evidence::Structure, "a member count that matches its length");
 }
 
 void walk_tile(Cursor& c, Walk& w) {
@@ -147,7 +147,7 @@ void walk_testrun(Cursor& c, Walk& w) {
   if (*version == kProfileStamp) {
     set_evidence(w, Evidence::Stamp, "the test run version 1.4 at offset 0");
   } else {
-    set_evidence(w, Evidence::Structure, "its fields fill the stream exactly");
+    set_evidence(w, Evidence::Structure, "fields that fill the stream exactly");
   }
 }
 
@@ -193,7 +193,7 @@ void walk_tileset_calibration(Cursor& c, Walk& w) {
     c.spectrum(tile + "SCI");
   }
   finish(c, 0, false, "tile set with calibration");
-  set_evidence(w, Evidence::Structure, "its tile count and texts fill the stream exactly");
+  set_evidence(w, Evidence::Structure, "a tile count and texts that fill the stream exactly");
 }
 
 void walk_profile_record(Cursor& c, Walk& w) {
@@ -213,7 +213,7 @@ void walk_station(Cursor& c, Walk& w) {
 void walk_testrun_record(Cursor& c, Walk& w) {
   testrun_record(c, "TR.");
   finish(c, 0, false, "test run record");
-  set_evidence(w, Evidence::Structure, "its fields fill the stream exactly");
+  set_evidence(w, Evidence::Structure, "fields that fill the stream exactly");
 }
 
 void walk_user_block(Cursor& c, Walk& w) {
