@@ -1,5 +1,7 @@
 #include "wire/layout_parts.hpp"
 
+#include <algorithm>
+
 #include "kvdata/automation/text.hpp"
 
 namespace kvdata::cli::layout {
@@ -81,6 +83,7 @@ void testrun_record(Cursor& c, const std::string& prefix) {
     const std::string s = iia + "Measurements" + idx(m) + ".";
     c.date_field(s + "Profile");
     const std::string count_name = s + "Tiles count";
+    const std::size_t count_at = c.pos();
     const std::size_t left_after = c.left() >= 2 ? c.left() - 2 : 0;
     const auto k = c.integer_field(count_name);
     if (!k) return;
@@ -90,10 +93,10 @@ void testrun_record(Cursor& c, const std::string& prefix) {
     }
     const std::size_t need = static_cast<std::size_t>(*k) * kIIATileBytes;
     if (need > left_after) {
-      c.fail(count_name, "a tile count that fits: it says " + std::to_string(*k) + " tiles of " +
-                             std::to_string(kIIATileBytes) + " bytes each (" +
-                             std::to_string(need) + " bytes), but only " +
-                             std::to_string(left_after) + " are left");
+      c.fail_at(count_at, count_name,
+                "a tile count that fits: it says " + std::to_string(*k) + " tiles of " +
+                    std::to_string(kIIATileBytes) + " bytes each (" + std::to_string(need) +
+                    " bytes), but only " + std::to_string(left_after) + " are left");
       return;
     }
     for (int t = 1; t <= *k && c.ok(); ++t) {
@@ -118,12 +121,15 @@ void finish(Cursor& c, std::size_t spare, bool required, const std::string& kind
     return;
   }
   if (left == 0) return;
-  if (left <= spare) {
-    c.filler("spare byte", left, "left by the writer after the encoding; not read");
-    return;
+  const std::size_t spare_bytes = std::min(left, spare);
+  if (spare_bytes > 0) {
+    c.filler("spare byte", spare_bytes, "left by the writer after the encoding; not read");
   }
-  c.fail("end of stream", "the end of the " + kind + " stream; " + std::to_string(left) +
-                              " more bytes follow that belong to no field");
+  if (left > spare_bytes) {
+    c.fail("end of stream", "the end of the " + kind + " stream; " +
+                                std::to_string(left - spare_bytes) +
+                                " more bytes follow that belong to no field");
+  }
 }
 
 }  // namespace kvdata::cli::layout
