@@ -25,6 +25,7 @@ int main(int argc, char** argv) {
   add_decode(app);
   add_encode(app);
   add_explain(app);
+  add_plot(app);
 
   try {
     app.parse(argc, argv);

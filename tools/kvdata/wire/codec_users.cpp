@@ -78,7 +78,8 @@ bool decode_user_objects(StreamKind kind, const ByteArray& a, Json& doc) {
     case StreamKind::Tolerance: {
       auto tol = KVTolerance::create();
       stream_in(*tol, a, "tolerance", {});
-      for (auto& [key, value] : tolerance_to_json(*tol).items()) doc[key] = value;
+      const Json fields = tolerance_to_json(*tol);
+      for (const auto& [key, value] : fields.items()) doc[key] = value;
       return true;
     }
     case StreamKind::TolSet: {
