@@ -2,6 +2,7 @@
 // the library lists them. Interface classes and facades are not creatable.
 #include "kvdata/automation/create_object.hpp"
 #include "kvdata/colour/ilu_d6510.hpp"
+#include "kvdata/stats/kv_test_run_spread_test_data.hpp"
 
 namespace kvdata {
 namespace {
@@ -13,6 +14,7 @@ std::shared_ptr<Object> make() {
 
 constexpr CreatableClass kClasses[] = {
     {u"KVData.ILU_D6510", &make<ILU_D6510>},
+    {u"KVData.KVTestRunSpreadTestData", &make<KVTestRunSpreadTestData>},
 };
 
 }  // namespace

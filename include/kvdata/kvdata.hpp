@@ -8,3 +8,4 @@
 #include "kvdata/automation.hpp"
 #include "kvdata/foundation.hpp"
 #include "kvdata/colour.hpp"
+#include "kvdata/stats.hpp"
