@@ -71,7 +71,12 @@ std::vector<tSpectrum> random_spectra(std::size_t count, std::uint32_t seed) {
 TEST(CalcXyzLabD6510, MatchesTheIlluminantBitForBit) {
   auto ilu = ILU_D6510::create();
   // Not a multiple of the lane count: the last block is partly filled.
-  const std::vector<tSpectrum> spectra = random_spectra(20011, 20240611u);
+  std::vector<tSpectrum> spectra = random_spectra(20011, 20240611u);
+  // Non-finite values in bands whose weights are all zero fault too.
+  spectra[16].Data(1) = std::numeric_limits<Single>::quiet_NaN();
+  spectra[17].Data(2) = std::numeric_limits<Single>::infinity();
+  spectra[18].Data(3) = -std::numeric_limits<Single>::infinity();
+  spectra[19].Data(40) = std::numeric_limits<Single>::quiet_NaN();
   const std::size_t n = spectra.size();
   std::vector<Single> flat(40 * n);
   for (std::size_t k = 0; k < n; ++k) {
@@ -109,6 +114,8 @@ TEST(CalcXyzLabD6510, MatchesTheIlluminantBitForBit) {
     if (!fault && (x(0) == 0.0f || x(2) == 0.0f)) ++clamped;
   }
   EXPECT_EQ(faults, expected_faults);
+  for (std::size_t k = 16; k < 20; ++k) EXPECT_TRUE(std::isnan(lab[3 * k])) << k;
+  EXPECT_FALSE(std::isnan(lab[3 * 20]));
   // The sample met every branch.
   EXPECT_GT(faults, 500u);
   EXPECT_GT(linear, 100u);

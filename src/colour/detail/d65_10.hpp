@@ -3,8 +3,8 @@
 // 10 nm interval, shared by ILU_D6510 and the batch conversion so that both
 // round at exactly the same points.
 //
-//   float w = weight(eXYZ::Yaxis, 20);          // 0.08854999, the stored weight
-//   float l = lab_l(ratio(y, 1), power(ratio(y, 1)));
+//   Single w = weight(1, 20);   // Y at band 20: 0.08854999, the stored weight
+//   Single l = lab_l(ratio(y, 1), power(ratio(y, 1)));   // L* of a Y
 
 #include <array>
 #include <cmath>
