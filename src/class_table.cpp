@@ -2,7 +2,11 @@
 // the library lists them. Interface classes and facades are not creatable.
 #include "kvdata/automation/create_object.hpp"
 #include "kvdata/colour/ilu_d6510.hpp"
+#include "kvdata/objects/kv_tol_set.hpp"
+#include "kvdata/objects/kv_tolerance.hpp"
+#include "kvdata/objects/kv_user.hpp"
 #include "kvdata/stats/kv_test_run_spread_test_data.hpp"
+#include "kvdata/streams/streams.hpp"
 
 namespace kvdata {
 namespace {
@@ -14,13 +18,15 @@ std::shared_ptr<Object> make() {
 
 constexpr CreatableClass kClasses[] = {
     {u"KVData.ILU_D6510", &make<ILU_D6510>},
+    {u"KVData.KVUser", &make<KVUser>},
+    {u"KVData.KVTolerance", &make<KVTolerance>},
+    {u"KVData.KVTolSet", &make<KVTolSet>},
     {u"KVData.KVTestRunSpreadTestData", &make<KVTestRunSpreadTestData>},
+    {u"KVData.Streams", &make<Streams>},
 };
 
 }  // namespace
 
-std::span<const CreatableClass> CreatableClasses() {
-  return std::span<const CreatableClass>(kClasses);
-}
+std::span<const CreatableClass> CreatableClasses() { return kClasses; }
 
 }  // namespace kvdata

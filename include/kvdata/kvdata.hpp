@@ -7,5 +7,7 @@
 
 #include "kvdata/automation.hpp"
 #include "kvdata/foundation.hpp"
+#include "kvdata/objects.hpp"
+#include "kvdata/streams.hpp"
 #include "kvdata/colour.hpp"
 #include "kvdata/stats.hpp"

@@ -11,6 +11,7 @@
 
 #include "kvdata/automation/error.hpp"
 #include "kvdata/colour/ilu_d6510.hpp"
+#include "support/error_number.hpp"
 
 namespace kvdata {
 namespace {
@@ -125,26 +126,21 @@ TEST(CalcXyzLabD6510, MatchesTheIlluminantBitForBit) {
 TEST(CalcXyzLabD6510, RefusesMismatchedOrOverlappingBuffers) {
   std::vector<Single> spectra(40 * 3, 50.0f);
   std::vector<Single> xyz(9, -1.0f), lab(9, -1.0f), small(8, -1.0f);
-  auto number = [](auto&& f) {
-    try {
-      f();
-    } catch (const Error& e) {
-      return e.number();
-    }
-    return Long{0};
-  };
-  EXPECT_EQ(number([&] { (void)calc_xyz_lab_d6510(spectra, small, lab); }), kInvalidProcedureCall);
-  EXPECT_EQ(number([&] { (void)calc_xyz_lab_d6510(spectra, xyz, small); }), kInvalidProcedureCall);
-  EXPECT_EQ(number([&] {
+  EXPECT_EQ(testing::error_number([&] { (void)calc_xyz_lab_d6510(spectra, small, lab); }),
+            kInvalidProcedureCall);
+  EXPECT_EQ(testing::error_number([&] { (void)calc_xyz_lab_d6510(spectra, xyz, small); }),
+            kInvalidProcedureCall);
+  EXPECT_EQ(testing::error_number([&] {
               (void)calc_xyz_lab_d6510(std::span<const Single>(spectra).first(41), xyz, lab);
             }),
             kInvalidProcedureCall);
-  EXPECT_EQ(
-      number([&] { (void)calc_xyz_lab_d6510(spectra, std::span<Single>(spectra).first(9), lab); }),
-      kInvalidProcedureCall);
-  EXPECT_EQ(
-      number([&] { (void)calc_xyz_lab_d6510(spectra, xyz, std::span<Single>(xyz).first(9)); }),
-      kInvalidProcedureCall);
+  EXPECT_EQ(testing::error_number([&] {
+              (void)calc_xyz_lab_d6510(spectra, std::span<Single>(spectra).first(9), lab);
+            }),
+            kInvalidProcedureCall);
+  EXPECT_EQ(testing::error_number(
+                [&] { (void)calc_xyz_lab_d6510(spectra, xyz, std::span<Single>(xyz).first(9)); }),
+            kInvalidProcedureCall);
   for (Single v : xyz) EXPECT_EQ(v, -1.0f);
   for (Single v : lab) EXPECT_EQ(v, -1.0f);
 

@@ -10,9 +10,12 @@
 
 #include "kvdata/automation/create_object.hpp"
 #include "kvdata/automation/error.hpp"
+#include "support/error_number.hpp"
 
 namespace kvdata {
 namespace {
+
+using testing::error_number;
 
 // Expected values are bit patterns of Singles worked out by hand from the
 // weight table with the rounding points of the conversion.
@@ -35,16 +38,6 @@ Array<Single> triple(Single a, Single b, Single c) {
   out(1) = b;
   out(2) = c;
   return out;
-}
-
-template <class F>
-Long error_number(F&& f) {
-  try {
-    f();
-  } catch (const Error& e) {
-    return e.number();
-  }
-  return 0;
 }
 
 TEST(ILU_D6510, IsCreatedByNameAndNamesItsIlluminant) {

@@ -10,9 +10,13 @@
 
 #include "kvdata/automation/create_object.hpp"
 #include "kvdata/automation/error.hpp"
+#include "kvdata/objects/kv_tol_set.hpp"
+#include "support/error_number.hpp"
 
 namespace kvdata {
 namespace {
+
+using testing::error_number;
 
 using Spread = KVTestRunSpreadTestData;
 
@@ -27,35 +31,6 @@ Variant sample(std::initializer_list<T> values, Long lower = 1) {
 const Array<Single>& table(const Variant& v) {
   return v.get<Array<Single>>();
 }
-
-template <class F>
-Long error_number(F&& f) {
-  try {
-    f();
-  } catch (const Error& e) {
-    return e.number();
-  }
-  return 0;
-}
-
-// A tolerance set of the tests' own; the spread test only keeps a reference.
-class TestTolSet final : public IKVTolSet {
- protected:
-  Long IKVTolSet_InstTypeID() const override { return 0; }
-  void IKVTolSet_InstTypeID(Long) override {}
-  Variant IKVTolSet_Description() const override { return String(); }
-  void IKVTolSet_Description_Let(const Variant&) override {}
-  void IKVTolSet_Description_Set(const Variant&) override {}
-  Long IKVTolSet_ID() const override { return 0; }
-  void IKVTolSet_ID(Long) override {}
-  Date IKVTolSet_CreateDate() const override { return Date{}; }
-  void IKVTolSet_CreateDate(Date) override {}
-  void IKVTolSet_Add(const std::shared_ptr<IKVTolerance>&, const String&) override {}
-  std::shared_ptr<IKVTolerance> IKVTolSet_Item(const Variant&) override { return nullptr; }
-  Long IKVTolSet_count() const override { return 0; }
-  void IKVTolSet_Remove(const Variant&) override {}
-  std::shared_ptr<Collection> IKVTolSet_NewEnum() const override { return nullptr; }
-};
 
 TEST(KVTestRunSpreadTestData, StartsEmptyAndRefusesWorkUntilInitialisedAndSelected) {
   auto rr = query<Spread>(CreateObject(u"KVData.KVTestRunSpreadTestData"));
@@ -347,7 +322,7 @@ TEST(KVTestRunSpreadTestData, KeysStayUniqueWhenACallerRemovesSamples) {
 
 TEST(KVTestRunSpreadTestData, KeepsTheCallersToleranceSetUntilReleased) {
   auto rr = Spread::create();
-  auto set = std::make_shared<TestTolSet>();
+  std::shared_ptr<IKVTolSet> set = KVTolSet::create();
   EXPECT_EQ(rr->KVRR_SetTolerance(set), 0);
   EXPECT_EQ(set.use_count(), 2);  // shared, not copied
   EXPECT_EQ(error_number([&] { rr->KVRR_SetTolerance(nullptr); }), kObjectNotSet);
