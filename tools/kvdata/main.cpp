@@ -26,6 +26,8 @@ int main(int argc, char** argv) {
   add_encode(app);
   add_explain(app);
   add_plot(app);
+  add_colour(app);
+  add_spread(app);
 
   try {
     app.parse(argc, argv);
