@@ -7,3 +7,4 @@
 
 #include "kvdata/automation.hpp"
 #include "kvdata/foundation.hpp"
+#include "kvdata/objects.hpp"
