@@ -10,6 +10,7 @@
 #include "objects/detail/block_stream.hpp"
 #include "objects/detail/tile_block.hpp"
 #include "streams/detail/checked_codec.hpp"
+#include "streams/detail/little_endian.hpp"
 
 namespace kvdata {
 namespace {
@@ -28,7 +29,7 @@ bool fits_integer(long long idx) {
 
 // Bytes of TSN as a codec String: the 4-byte count and the Windows-1252 text.
 std::size_t tsn_field_bytes(const String& tsn) {
-  return 4 + ansi::encode(tsn).size();
+  return detail::kWireWidth<Long> + ansi::encode(tsn).size();
 }
 
 }  // namespace
