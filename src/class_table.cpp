@@ -5,6 +5,7 @@
 #include "kvdata/objects/kv_calibration.hpp"
 #include "kvdata/objects/kv_tile.hpp"
 #include "kvdata/objects/kv_tile_set.hpp"
+#include "kvdata/streams/streams.hpp"
 
 namespace kvdata {
 namespace {
@@ -20,12 +21,13 @@ constexpr CreatableClass kClasses[] = {
     {u"KVData.KVCalTile", &make<KVCalTile>},
     {u"KVData.KVCalibration", &make<KVCalibration>},
     {u"KVData.KVTileSet", &make<KVTileSet>},
+    {u"KVData.Streams", &make<Streams>},
 };
 
 }  // namespace
 
 std::span<const CreatableClass> CreatableClasses() {
-  return kClasses;
+  return std::span<const CreatableClass>(kClasses);
 }
 
 }  // namespace kvdata

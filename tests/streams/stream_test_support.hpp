@@ -83,6 +83,29 @@ inline ByteArray stream_of(const std::vector<Byte>& bytes, Long lower = 0) {
   return stream;
 }
 
+// A spectrum whose 40 values are distinct and exact: base + band / 4.
+inline tSpectrum spectrum(float base) {
+  tSpectrum s;
+  for (Long band = 1; band <= kBandCount; ++band)
+    s.Data(band) = base + static_cast<float>(band) / 4;
+  return s;
+}
+inline tSCPair sc_pair(float base) {
+  tSCPair p;
+  p.Spectrum(eSC::SCE) = spectrum(base);
+  p.Spectrum(eSC::SCI) = spectrum(base + 1000);
+  return p;
+}
+// The expected image of a spectrum: band 1 first.
+inline Wire& put(Wire& w, const tSpectrum& s) {
+  for (const float v : s.Data) w.f32(v);
+  return w;
+}
+inline Wire& put(Wire& w, const tSCPair& p) {
+  put(w, p.Spectrum(eSC::SCE));
+  return put(w, p.Spectrum(eSC::SCI));
+}
+
 // Largest single allocation requested since the last reset (the stream
 // tests replace the global allocation functions to observe it).
 void reset_largest_allocation();
