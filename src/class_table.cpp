@@ -5,6 +5,9 @@
 #include "kvdata/objects/kv_calibration.hpp"
 #include "kvdata/objects/kv_tile.hpp"
 #include "kvdata/objects/kv_tile_set.hpp"
+#include "kvdata/objects/kv_tol_set.hpp"
+#include "kvdata/objects/kv_tolerance.hpp"
+#include "kvdata/objects/kv_user.hpp"
 #include "kvdata/streams/streams.hpp"
 
 namespace kvdata {
@@ -15,10 +18,12 @@ std::shared_ptr<Object> make() {
   return T::create();
 }
 
-// Filled as the classes are added: {u"KVData.KVUser", &make<KVUser>}, ...
 constexpr CreatableClass kClasses[] = {
     {u"KVData.KVTile", &make<KVTile>},
     {u"KVData.KVCalTile", &make<KVCalTile>},
+    {u"KVData.KVUser", &make<KVUser>},
+    {u"KVData.KVTolerance", &make<KVTolerance>},
+    {u"KVData.KVTolSet", &make<KVTolSet>},
     {u"KVData.KVCalibration", &make<KVCalibration>},
     {u"KVData.KVTileSet", &make<KVTileSet>},
     {u"KVData.Streams", &make<Streams>},
@@ -26,8 +31,6 @@ constexpr CreatableClass kClasses[] = {
 
 }  // namespace
 
-std::span<const CreatableClass> CreatableClasses() {
-  return std::span<const CreatableClass>(kClasses);
-}
+std::span<const CreatableClass> CreatableClasses() { return kClasses; }
 
 }  // namespace kvdata

@@ -7,5 +7,6 @@
 
 #include "kvdata/automation.hpp"
 #include "kvdata/foundation.hpp"
+#include "kvdata/objects.hpp"
 #include "kvdata/streams.hpp"
 #include "kvdata/objects.hpp"
