@@ -1,12 +1,13 @@
 #include "kvdata/objects/kv_calibration.hpp"
 
 #include <cstddef>
+#include <new>
 
 #include "kvdata/automation/error.hpp"
 #include "kvdata/automation/text.hpp"
 #include "kvdata/objects/kv_cal_tile.hpp"
-#include "objects/detail/block_fields.hpp"
-#include "objects/detail/block_stream.hpp"
+#include "objects/detail/object_stream.hpp"
+#include "objects/detail/record_image.hpp"
 #include "streams/detail/fixed_text.hpp"
 #include "streams/detail/little_endian.hpp"
 
@@ -50,7 +51,7 @@ static_assert(value_offset(13, 1, 40) == 4184);
 void store_slot(std::span<Byte> block, Long idx, const tSCPair& pair) {
   for (Long sc = 0; sc <= 1; ++sc) {
     for (Long band = 1; band <= kBandCount; ++band) {
-      detail::block_set<Single>(block, value_offset(idx, sc, band), pair.Spectrum(sc).Data(band));
+      detail::set_field<Single>(block, value_offset(idx, sc, band), pair.Spectrum(sc).Data(band));
     }
   }
 }
@@ -59,7 +60,7 @@ tSCPair load_slot(std::span<const Byte> block, Long idx) {
   tSCPair pair;
   for (Long sc = 0; sc <= 1; ++sc) {
     for (Long band = 1; band <= kBandCount; ++band) {
-      pair.Spectrum(sc).Data(band) = detail::block_get<Single>(block, value_offset(idx, sc, band));
+      pair.Spectrum(sc).Data(band) = detail::get_field<Single>(block, value_offset(idx, sc, band));
     }
   }
   return pair;
@@ -73,9 +74,9 @@ std::shared_ptr<KVCalibration> KVCalibration::create() {
 }
 
 void KVCalibration::v1Calibration(const tTileSetCalibration& value) {
-  detail::block_set_text(block_, kTSNOffset, kTSNUnits, value.TSN);
-  detail::block_set<Date>(block_, kCertifiedOffset, value.Certified);
-  detail::block_set<Single>(block_, kTempCalibratedOffset, value.TempCalibrated);
+  detail::set_text_field(block_, kTSNOffset, kTSNUnits, value.TSN);
+  detail::set_field<Date>(block_, kCertifiedOffset, value.Certified);
+  detail::set_field<Single>(block_, kTempCalibratedOffset, value.TempCalibrated);
   for (Integer idx = 1; idx <= kTileCount; ++idx) {
     store_slot(block_, idx, value.Tiles(idx));  // error 9 at the first index missing
   }
@@ -105,27 +106,27 @@ Variant KVCalibration::IKVObj_DateCreated() const {
 }
 
 String KVCalibration::IKVCalibration_TSN() const {
-  return detail::block_text(block_, kTSNOffset, kTSNUnits);
+  return detail::get_raw_text_field(block_, kTSNOffset, kTSNUnits);
 }
 
 void KVCalibration::IKVCalibration_TSN(const String& value) {
-  detail::block_set_text(block_, kTSNOffset, kTSNUnits, value);
+  detail::set_text_field(block_, kTSNOffset, kTSNUnits, value);
 }
 
 Date KVCalibration::IKVCalibration_DateCertified() const {
-  return detail::block_get<Date>(block_, kCertifiedOffset);
+  return detail::get_field<Date>(block_, kCertifiedOffset);
 }
 
 void KVCalibration::IKVCalibration_DateCertified(Date value) {
-  detail::block_set<Date>(block_, kCertifiedOffset, value);
+  detail::set_field<Date>(block_, kCertifiedOffset, value);
 }
 
 Single KVCalibration::IKVCalibration_TempCalibrated() const {
-  return detail::block_get<Single>(block_, kTempCalibratedOffset);
+  return detail::get_field<Single>(block_, kTempCalibratedOffset);
 }
 
 void KVCalibration::IKVCalibration_TempCalibrated(Single value) {
-  detail::block_set<Single>(block_, kTempCalibratedOffset, value);
+  detail::set_field<Single>(block_, kTempCalibratedOffset, value);
 }
 
 void KVCalibration::IKVCalibration_Tiles(Integer idx, const std::shared_ptr<IKVCalTile>& tile) {
@@ -147,14 +148,21 @@ std::shared_ptr<IKVCalTile> KVCalibration::IKVCalibration_Tiles(Integer idx) {
 
 bool KVCalibration::IKVStream_StreamIn(const ByteArray& bytStream, Long& Position) {
   std::array<Byte, kBlockBytes> scratch{};
-  if (!detail::read_block(bytStream, Position, scratch)) return false;
+  if (!detail::take_block(bytStream, Position, scratch)) return false;
   block_ = scratch;
   return true;
 }
 
 bool KVCalibration::IKVStream_StreamOut(ByteArray& bytStream, Long& Position) {
-  if (!detail::size_stream_to_end(bytStream, Position, kBlockBytes)) return false;
-  return detail::write_block(bytStream, Position, block_);
+  try {
+    if (Position < 0) return false;  // before any array a writer makes
+    detail::resize_stream(bytStream, detail::index_after(Position, kBlockBytes));
+    return detail::put_block(bytStream, Position, block_);
+  } catch (const Error&) {
+    return false;
+  } catch (const std::bad_alloc&) {
+    return false;
+  }
 }
 
 Long KVCalibration::IKVStream_StreamLen() const {

@@ -1,9 +1,11 @@
 #include "kvdata/objects/kv_tile.hpp"
 
-#include "kvdata/automation/text.hpp"
-#include "objects/detail/block_fields.hpp"
-#include "objects/detail/block_stream.hpp"
+#include <new>
+
+#include "kvdata/automation/error.hpp"
 #include "objects/detail/narrow_single.hpp"
+#include "objects/detail/object_stream.hpp"
+#include "objects/detail/record_image.hpp"
 #include "objects/detail/tile_block.hpp"
 
 namespace kvdata {
@@ -39,31 +41,31 @@ void KVTile::IKVTile_Order(Integer value) {
 }
 
 String KVTile::IKVTile_ColorName() const {
-  return trim_blanks(detail::block_text(block_, detail::kTileNameOffset, detail::kTileNameUnits));
+  return detail::get_text_field(block_, detail::kTileNameOffset, detail::kTileNameUnits);
 }
 
 void KVTile::IKVTile_ColorName(const String& value) {
-  detail::block_set_text(block_, detail::kTileNameOffset, detail::kTileNameUnits, value);
+  detail::set_text_field(block_, detail::kTileNameOffset, detail::kTileNameUnits, value);
   write_back();
 }
 
 Long KVTile::IKVTile_ColorRGB() const {
-  return detail::block_get<Long>(block_, detail::kTileColorRGBOffset);
+  return detail::get_field<Long>(block_, detail::kTileColorRGBOffset);
 }
 
 void KVTile::IKVTile_ColorRGB(Long value) {
-  detail::block_set<Long>(block_, detail::kTileColorRGBOffset, value);
+  detail::set_field<Long>(block_, detail::kTileColorRGBOffset, value);
   write_back();
 }
 
 Double KVTile::IKVTile_TempCompWL(const Integer& idx) const {
   if (idx < 1 || idx > kBandCount) return 0.0;
-  return static_cast<Double>(detail::block_get<Single>(block_, detail::tile_band_offset(idx)));
+  return static_cast<Double>(detail::get_field<Single>(block_, detail::tile_band_offset(idx)));
 }
 
 void KVTile::IKVTile_TempCompWL(const Integer& idx, const Double& value) {
   if (idx >= 1 && idx <= kBandCount) {
-    detail::block_set<Single>(block_, detail::tile_band_offset(idx),
+    detail::set_field<Single>(block_, detail::tile_band_offset(idx),
                               detail::narrow_to_single(value));
   }
   write_back();
@@ -71,14 +73,21 @@ void KVTile::IKVTile_TempCompWL(const Integer& idx, const Double& value) {
 
 bool KVTile::IKVStream_StreamIn(const ByteArray& bytStream, Long& Position) {
   detail::TileBlock scratch{};
-  if (!detail::read_block(bytStream, Position, scratch)) return false;
+  if (!detail::take_block(bytStream, Position, scratch)) return false;
   block_ = scratch;
   return true;
 }
 
 bool KVTile::IKVStream_StreamOut(ByteArray& bytStream, Long& Position) {
-  if (!detail::size_stream_to_end(bytStream, Position, kTileBlockBytes)) return false;
-  return detail::write_block(bytStream, Position, block_);
+  try {
+    if (Position < 0) return false;  // before any array a writer makes
+    detail::resize_stream(bytStream, detail::index_after(Position, kTileBlockBytes));
+    return detail::put_block(bytStream, Position, block_);
+  } catch (const Error&) {
+    return false;
+  } catch (const std::bad_alloc&) {
+    return false;
+  }
 }
 
 Long KVTile::IKVStream_StreamLen() const {

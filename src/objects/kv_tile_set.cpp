@@ -7,7 +7,7 @@
 #include "kvdata/automation/ansi.hpp"
 #include "kvdata/automation/error.hpp"
 #include "kvdata/objects/kv_tile.hpp"
-#include "objects/detail/block_stream.hpp"
+#include "objects/detail/object_stream.hpp"
 #include "objects/detail/tile_block.hpp"
 #include "streams/detail/checked_codec.hpp"
 #include "streams/detail/little_endian.hpp"
@@ -106,7 +106,7 @@ bool KVTileSet::IKVStream_StreamIn(const ByteArray& bytStream, Long& Position) {
     for (long long i = lower; i <= upper; ++i) {
       if (!fits_integer(i)) return false;
       detail::TileBlock block{};
-      if (!detail::read_block(bytStream, Position, block)) return false;
+      if (!detail::take_block(bytStream, Position, block)) return false;
       if (is_tile_index(i)) record_.Tiles(static_cast<Long>(i)) = detail::decode_tile(block);
     }
     return true;
@@ -119,16 +119,17 @@ bool KVTileSet::IKVStream_StreamIn(const ByteArray& bytStream, Long& Position) {
 
 bool KVTileSet::IKVStream_StreamOut(ByteArray& bytStream, Long& Position) {
   try {
+    if (Position < 0) return false;  // before any array a writer makes
     const std::size_t tiles = record_.Tiles.has_bounds() ? record_.Tiles.size() : 0;
     const std::size_t total = tsn_field_bytes(record_.TSN) + tiles * detail::kTileBlockBytes;
-    if (!detail::size_stream_to_end(bytStream, Position, total)) return false;
+    detail::resize_stream(bytStream, detail::index_after(Position, total));
     if (!checked::write_string(record_.TSN, bytStream, Position)) return false;
     const long long lower = record_.Tiles.lbound();
     const long long upper = record_.Tiles.ubound();
     for (long long i = lower; i <= upper; ++i) {
       detail::TileBlock block{};
       detail::encode_tile(record_.Tiles(static_cast<Long>(i)), block);
-      if (!detail::write_block(bytStream, Position, block)) return false;
+      if (!detail::put_block(bytStream, Position, block)) return false;
     }
     return true;
   } catch (const Error&) {

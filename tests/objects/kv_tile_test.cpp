@@ -167,11 +167,11 @@ TEST(KVTile, StreamPositionsThatWouldOverflowFail) {
   }
 
   // Reading from an array whose last index is the largest Long: the bytes are there,
-  // but Position cannot move past the last one.
+  // but Position could not move past the last one, so none is taken.
   ByteArray top(kMax - 263, kMax);
   Long position = kMax - 263;
   EXPECT_FALSE(tile->StreamIn(top, position));
-  EXPECT_EQ(position, kMax);
+  EXPECT_EQ(position, kMax - 263);
   EXPECT_EQ(tile->ColorRGB(), 5);
 }
 

@@ -1,7 +1,7 @@
 #pragma once
 // Small helpers shared by the tile, tile-set and calibration tests: byte
-// arrays with a chosen lower bound, slices of them, error numbers, and an
-// event-log sink that keeps codec entries out of the system log.
+// arrays with a chosen lower bound, slices of them, and an event-log sink
+// that keeps codec entries out of the system log.
 
 #include <gtest/gtest.h>
 
@@ -9,6 +9,7 @@
 #include <vector>
 
 #include "kvdata/kvdata.hpp"
+#include "support/error_number.hpp"
 
 namespace kvdata::testing {
 
@@ -43,17 +44,6 @@ inline Bytes cat(std::initializer_list<Bytes> parts) {
   Bytes out;
   for (const Bytes& p : parts) out.insert(out.end(), p.begin(), p.end());
   return out;
-}
-
-// The number of the error `f` raises, 0 when it raises none.
-template <class F>
-Long error_number(F&& f) {
-  try {
-    f();
-  } catch (const Error& e) {
-    return e.number();
-  }
-  return 0;
 }
 
 // Collects event-log entries for the life of the object.
