@@ -1,6 +1,7 @@
 // The table of creatable classes, one line per class, in the order in which
 // the library lists them. Interface classes and facades are not creatable.
 #include "kvdata/automation/create_object.hpp"
+#include "kvdata/colour/ilu_d6510.hpp"
 #include "kvdata/objects/kv_cal_tile.hpp"
 #include "kvdata/objects/kv_calibration.hpp"
 #include "kvdata/objects/kv_tile.hpp"
@@ -8,6 +9,7 @@
 #include "kvdata/objects/kv_tol_set.hpp"
 #include "kvdata/objects/kv_tolerance.hpp"
 #include "kvdata/objects/kv_user.hpp"
+#include "kvdata/stats/kv_test_run_spread_test_data.hpp"
 #include "kvdata/streams/streams.hpp"
 
 namespace kvdata {
@@ -19,6 +21,7 @@ std::shared_ptr<Object> make() {
 }
 
 constexpr CreatableClass kClasses[] = {
+    {u"KVData.ILU_D6510", &make<ILU_D6510>},
     {u"KVData.KVTile", &make<KVTile>},
     {u"KVData.KVCalTile", &make<KVCalTile>},
     {u"KVData.KVUser", &make<KVUser>},
@@ -26,6 +29,7 @@ constexpr CreatableClass kClasses[] = {
     {u"KVData.KVTolSet", &make<KVTolSet>},
     {u"KVData.KVCalibration", &make<KVCalibration>},
     {u"KVData.KVTileSet", &make<KVTileSet>},
+    {u"KVData.KVTestRunSpreadTestData", &make<KVTestRunSpreadTestData>},
     {u"KVData.Streams", &make<Streams>},
 };
 

@@ -9,4 +9,5 @@
 #include "kvdata/foundation.hpp"
 #include "kvdata/objects.hpp"
 #include "kvdata/streams.hpp"
-#include "kvdata/objects.hpp"
+#include "kvdata/colour.hpp"
+#include "kvdata/stats.hpp"
