@@ -24,6 +24,14 @@ std::vector<Byte> whole_array(const ByteArray& a) {
   return std::vector<Byte>(a.begin(), a.end());
 }
 
+void check_width(const String& text, std::size_t units, const std::string& path) {
+  if (text.size() > units) {
+    bad_input(path + ": " + std::to_string(text.size()) +
+              " UTF-16 code units, but the field holds " + std::to_string(units) +
+              "; the library would cut the text");
+  }
+}
+
 }  // namespace codec
 
 StreamKind document_kind(const Json& doc, std::optional<StreamKind> kind) {
@@ -50,7 +58,8 @@ Json decode_stream(StreamKind kind, std::span<const Byte> bytes) {
   Json doc = Json::object();
   doc["kind"] = std::string(kind_name(kind));
   try {
-    if (codec::decode_record_stream(kind, a, doc) || codec::decode_user_objects(kind, a, doc)) {
+    if (codec::decode_record_stream(kind, a, doc) || codec::decode_user_objects(kind, a, doc) ||
+        codec::decode_tile_objects(kind, a, doc)) {
       return doc;
     }
   } catch (const Error& e) {
@@ -63,7 +72,8 @@ std::vector<Byte> encode_stream(StreamKind kind, const Json& doc) {
   document_kind(doc, kind);
   std::vector<Byte> out;
   try {
-    if (codec::encode_record_stream(kind, doc, out) || codec::encode_user_objects(kind, doc, out)) {
+    if (codec::encode_record_stream(kind, doc, out) || codec::encode_user_objects(kind, doc, out) ||
+        codec::encode_tile_objects(kind, doc, out)) {
       return out;
     }
   } catch (const Error& e) {

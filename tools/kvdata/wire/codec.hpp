@@ -42,11 +42,17 @@ std::vector<Byte> from_array(const ByteArray& a, Long from, Long to);
 // The whole array, lower to upper bound.
 std::vector<Byte> whole_array(const ByteArray& a);
 
+// A text for a fixed-width field of `units` UTF-16 code units: a longer text
+// would be cut by the library, so it is refused here, naming `path`.
+void check_width(const String& text, std::size_t units, const std::string& path);
+
 // Per group of kinds; each returns false when it does not handle `kind`.
 bool decode_record_stream(StreamKind kind, const ByteArray& a, Json& doc);
 bool encode_record_stream(StreamKind kind, const Json& doc, std::vector<Byte>& out);
 bool decode_user_objects(StreamKind kind, const ByteArray& a, Json& doc);
 bool encode_user_objects(StreamKind kind, const Json& doc, std::vector<Byte>& out);
+bool decode_tile_objects(StreamKind kind, const ByteArray& a, Json& doc);
+bool encode_tile_objects(StreamKind kind, const Json& doc, std::vector<Byte>& out);
 
 }  // namespace codec
 }  // namespace kvdata::cli

@@ -169,6 +169,17 @@ bool encode_record_stream(StreamKind kind, const Json& doc, std::vector<Byte>& o
     }
     case StreamKind::UserBlock: {
       auto user = member<tUser>(doc, "User");
+      check_width(user.USERID, 8, "User.USERID");
+      check_width(user.LastName, 30, "User.LastName");
+      check_width(user.FirstName, 30, "User.FirstName");
+      check_width(user.UserPWD, 8, "User.UserPWD");
+      check_width(user.UserMail, 50, "User.UserMail");
+      check_width(user.RoleCode, 1, "User.RoleCode");
+      if (!user.RoleCode.empty() && user.RoleCode[0] > 0xFF) {
+        bad_input(
+            "User.RoleCode: only the low byte of the role travels in a user block, so it "
+            "must be a character up to U+00FF");
+      }
       out = write_with("user block", kUserBlockBytes, [&](ByteArray& s, Long& p) {
         return streams().Stream_User(kTo, s, p, user);
       });
@@ -176,6 +187,9 @@ bool encode_record_stream(StreamKind kind, const Json& doc, std::vector<Byte>& o
     }
     case StreamKind::Organization: {
       auto org = member<tOrganization>(doc, "Org");
+      check_width(org.Organization, 50, "Org.Organization");
+      check_width(org.Alias, 8, "Org.Alias");
+      check_width(org.Avail, 1, "Org.Avail");
       out = write_with("organisation", kOrganizationBlockBytes, [&](ByteArray& s, Long& p) {
         return streams().Stream_Organization(kTo, s, p, org);
       });

@@ -48,16 +48,23 @@ Json tolerance_to_json(const IKVTolerance& t) {
   return j;
 }
 
+// A text field of a fixed-width block, checked against its width.
+String text_field(Fields& f, const char* name, std::size_t units) {
+  String text = read_string(f.get(name), f.at(name));
+  check_width(text, units, f.at(name));
+  return text;
+}
+
 // Fills `t` from the tolerance fields of `f` (under `path`).
 void tolerance_from_json(Fields& f, IKVTolerance& t) {
   t.ID(read_long(f.get("ID"), f.at("ID")));
-  t.TolName(read_string(f.get("TolName"), f.at("TolName")));
-  t.Description(read_string(f.get("Description"), f.at("Description")));
+  t.TolName(text_field(f, "TolName", 50));
+  t.Description(text_field(f, "Description", 255));
   t.MinFail(double_from_json(f.get("MinFail"), f.at("MinFail")));
   t.MinWarn(double_from_json(f.get("MinWarn"), f.at("MinWarn")));
   t.MaxWarn(double_from_json(f.get("MaxWarn"), f.at("MaxWarn")));
   t.MaxFail(double_from_json(f.get("MaxFail"), f.at("MaxFail")));
-  t.Misc(read_string(f.get("Misc"), f.at("Misc")));
+  t.Misc(text_field(f, "Misc", 50));
 }
 
 }  // namespace
@@ -108,6 +115,13 @@ bool encode_user_objects(StreamKind kind, const Json& doc, std::vector<Byte>& ou
       tUser record;
       read_record(f.get("v1User"), "v1User", record);
       f.done();
+      check_width(record.USERID, 30, "v1User.USERID");
+      check_width(record.LastName, 50, "v1User.LastName");
+      check_width(record.FirstName, 50, "v1User.FirstName");
+      check_width(record.UserPWD, 30, "v1User.UserPWD");
+      check_width(record.UserMail, 255, "v1User.UserMail");
+      check_width(record.RoleCode, 1, "v1User.RoleCode");
+      check_width(record.Disabled, 1, "v1User.Disabled");
       auto user = KVUser::create();
       user->v1User(record);
       ByteArray a(0, -1);
@@ -135,7 +149,7 @@ bool encode_user_objects(StreamKind kind, const Json& doc, std::vector<Byte>& ou
       s.ID(read_long(f.get("ID"), f.at("ID")));
       s.InstTypeID(read_long(f.get("InstTypeID"), f.at("InstTypeID")));
       s.CreateDate(date_from_json(f.get("CreateDate"), f.at("CreateDate")));
-      s.Description(Variant(read_string(f.get("Description"), f.at("Description"))));
+      s.Description(Variant(text_field(f, "Description", 255)));
       const Json& members = read_array(f.get("Tolerances"), f.at("Tolerances"));
       Long i = 1;
       for (const Json& m : members) {
