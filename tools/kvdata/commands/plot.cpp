@@ -40,11 +40,11 @@ struct Plotter {
   bool sce;
   bool sci;
 
-  // SCE solid, SCI dashed, as chosen with --sc.
+  // SCE solid and SCI dashed when both are drawn; one alone is solid.
   void pair(const std::string& series, const std::string& colour,
             const FixedArray<tSpectrum, 0, 1>& p) {
     if (sce) chart.add_line(series, colour, points(p(eSC::SCE)));
-    if (sci) chart.add_line(series, colour, points(p(eSC::SCI)), true);
+    if (sci) chart.add_line(series, colour, points(p(eSC::SCI)), sce);
   }
 };
 
