@@ -11,6 +11,7 @@
 #include <cstddef>
 #include <initializer_list>
 #include <new>
+#include <stdexcept>
 #include <type_traits>
 #include <utility>
 #include <vector>
