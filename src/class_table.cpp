@@ -1,6 +1,10 @@
 // The table of creatable classes, one line per class, in the order in which
 // the library lists them. Interface classes and facades are not creatable.
 #include "kvdata/automation/create_object.hpp"
+#include "kvdata/objects/kv_tol_set.hpp"
+#include "kvdata/objects/kv_tolerance.hpp"
+#include "kvdata/objects/kv_user.hpp"
+#include "kvdata/streams/streams.hpp"
 
 namespace kvdata {
 namespace {
@@ -10,15 +14,15 @@ std::shared_ptr<Object> make() {
   return T::create();
 }
 
-// Filled as the classes are added: {u"KVData.KVUser", &make<KVUser>}, ...
 constexpr CreatableClass kClasses[] = {
-    {u"", nullptr},
+    {u"KVData.KVUser", &make<KVUser>},
+    {u"KVData.KVTolerance", &make<KVTolerance>},
+    {u"KVData.KVTolSet", &make<KVTolSet>},
+    {u"KVData.Streams", &make<Streams>},
 };
 
 }  // namespace
 
-std::span<const CreatableClass> CreatableClasses() {
-  return std::span<const CreatableClass>(kClasses).subspan(1);
-}
+std::span<const CreatableClass> CreatableClasses() { return kClasses; }
 
 }  // namespace kvdata

@@ -1,0 +1,6 @@
+#pragma once
+// Byte-stream serialization: the field codec, the record streams and the
+// stream files.
+
+#include "kvdata/streams/field_codec.hpp"
+#include "kvdata/streams/streams.hpp"

@@ -1,0 +1,376 @@
+#include <gtest/gtest.h>
+
+#include <limits>
+#include <string>
+#include <vector>
+
+#include "kvdata/kvdata.hpp"
+#include "streams/detail/checked_codec.hpp"
+#include "streams/stream_test_support.hpp"
+
+namespace kvdata {
+namespace {
+
+using testing::contents;
+using testing::LogCapture;
+using testing::stream_of;
+using testing::Wire;
+using Bytes = std::vector<Byte>;
+
+constexpr Long kLongMax = std::numeric_limits<Long>::max();
+
+TEST(FieldCodec, WritesTheWorkedExamplesByteForByte) {
+  LogCapture log;
+  ByteArray stream(0, -1);
+  Long pos = 0;
+  StringToArray(u"abc", stream, pos);
+  EXPECT_EQ(contents(stream), (Bytes{0x03, 0x00, 0x00, 0x00, 0x61, 0x62, 0x63}));
+  EXPECT_EQ(pos, 7);
+
+  LongToArray(1, stream, pos);
+  IntegerToArray(-2, stream, pos);
+  BooleanToArray(true, stream, pos);
+  SingleToArray(1.0f, stream, pos);
+  DateToArray(Date{1.5}, stream, pos);
+  BooleanToArray(false, stream, pos);
+  EXPECT_EQ(contents(stream), (Bytes{0x03, 0x00, 0x00, 0x00, 0x61, 0x62, 0x63,        // "abc"
+                                     0x01, 0x00, 0x00, 0x00,                          // Long 1
+                                     0xFE, 0xFF,                                      // Integer -2
+                                     0x01,                                            // True
+                                     0x00, 0x00, 0x80, 0x3F,                          // Single 1
+                                     0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0xF8, 0x3F,  // Date 1.5
+                                     0x00}));                                         // False
+  EXPECT_EQ(pos, 27);
+  EXPECT_EQ(stream.lbound(), 0);
+  EXPECT_EQ(stream.ubound(), 26);
+
+  // Signed extremes and sign bits land in the high byte.
+  ByteArray more(0, -1);
+  pos = 0;
+  LongToArray(std::numeric_limits<Long>::min(), more, pos);
+  IntegerToArray(0x1234, more, pos);
+  SingleToArray(-2.5f, more, pos);
+  EXPECT_EQ(contents(more), (Bytes{0x00, 0x00, 0x00, 0x80, 0x34, 0x12, 0x00, 0x00, 0x20, 0xC0}));
+  EXPECT_TRUE(log.entries.empty());
+}
+
+TEST(FieldCodec, ReadersTakeTheLittleEndianImages) {
+  const ByteArray stream =
+      stream_of({0xFE, 0xFF, 0x78, 0x56, 0x34, 0x12, 0x00, 0x00, 0x20, 0xC0, 0x00, 0x00, 0x00, 0x00,
+                 0x00, 0x00, 0xF8, 0x3F, 0x01, 0x02, 0x03, 0x00, 0x00, 0x00, 0x61, 0x62, 0x63},
+                1);
+  Long pos = 1;
+  Integer i = 0;
+  Long l = 0;
+  Single f = 0;
+  Date d;
+  bool b = false;
+  String s;
+  IntegerFromArray(stream, pos, i);
+  LongFromArray(stream, pos, l);
+  SingleFromArray(stream, pos, f);
+  DateFromArray(stream, pos, d);
+  EXPECT_EQ(i, -2);
+  EXPECT_EQ(l, 0x12345678);
+  EXPECT_EQ(f, -2.5f);
+  EXPECT_EQ(d, Date{1.5});
+  BooleanFromArray(stream, pos, b);
+  EXPECT_TRUE(b);
+  BooleanFromArray(stream, pos, b);  // 02 is not True
+  EXPECT_FALSE(b);
+  StringFromArray(stream, pos, s);
+  EXPECT_EQ(s, u"abc");
+  EXPECT_EQ(pos, 28);
+}
+
+TEST(FieldCodec, OnlyTheByteOneReadsAsTrue) {
+  const ByteArray stream = stream_of({0x00, 0x01, 0x02, 0xFF, 0x80});
+  Long pos = 0;
+  std::vector<bool> seen;
+  for (int k = 0; k < 5; ++k) {
+    bool b = true;
+    BooleanFromArray(stream, pos, b);
+    seen.push_back(b);
+  }
+  EXPECT_EQ(seen, (std::vector<bool>{false, true, false, false, false}));
+  EXPECT_EQ(pos, 5);
+}
+
+TEST(FieldCodec, WritersGrowToTheExactEndAndKeepTheLowerBound) {
+  LogCapture log;
+  ByteArray one(0, 0);
+  Long pos = 0;
+  LongToArray(7, one, pos);
+  EXPECT_EQ(one.lbound(), 0);
+  EXPECT_EQ(one.ubound(), 3);
+  EXPECT_EQ(pos, 4);
+
+  ByteArray gap = stream_of({0xAA, 0xBB, 0xCC, 0xDD});
+  pos = 10;
+  SingleToArray(1.0f, gap, pos);
+  EXPECT_EQ(contents(gap),
+            (Bytes{0xAA, 0xBB, 0xCC, 0xDD, 0, 0, 0, 0, 0, 0, 0x00, 0x00, 0x80, 0x3F}));
+  EXPECT_EQ(pos, 14);
+
+  ByteArray loaded(1, 1);
+  pos = 1;
+  DateToArray(Date{0}, loaded, pos);
+  BooleanToArray(true, loaded, pos);
+  EXPECT_EQ(loaded.lbound(), 1);
+  EXPECT_EQ(loaded.ubound(), 9);
+  EXPECT_EQ(pos, 10);
+
+  // A stream already long enough is written in place, never shrunk.
+  ByteArray big(0, 99);
+  pos = 0;
+  IntegerToArray(1, big, pos);
+  StringToArray(u"xy", big, pos);
+  EXPECT_EQ(big.ubound(), 99);
+  EXPECT_EQ(pos, 8);
+
+  // The empty string is its count alone, both ways.
+  ByteArray empty(0, -1);
+  pos = 0;
+  StringToArray(u"", empty, pos);
+  EXPECT_EQ(contents(empty), (Bytes{0, 0, 0, 0}));
+  EXPECT_EQ(pos, 4);
+  String back = u"old";
+  pos = 0;
+  StringFromArray(empty, pos, back);
+  EXPECT_EQ(back, u"");
+  EXPECT_EQ(pos, 4);
+  EXPECT_TRUE(log.entries.empty());
+}
+
+TEST(FieldCodec, TextTravelsAsWindows1252Bytes) {
+  ByteArray stream(0, -1);
+  Long pos = 0;
+  StringToArray(u"caf\u00e9 \u20ac\u4e2d", stream, pos);
+  // The count is in bytes; a character outside the code page becomes '?'.
+  EXPECT_EQ(contents(stream),
+            (Bytes{0x07, 0x00, 0x00, 0x00, 0x63, 0x61, 0x66, 0xE9, 0x20, 0x80, 0x3F}));
+  String back;
+  pos = 0;
+  StringFromArray(stream, pos, back);
+  EXPECT_EQ(back, u"caf\u00e9 \u20ac?");
+  EXPECT_EQ(pos, 11);
+}
+
+TEST(FieldCodec, FixedWidthFailuresChangeNothingAndLogOneEntry) {
+  LogCapture log;
+  // Reading across the end of the array.
+  const ByteArray three = stream_of({1, 2, 3});
+  Long pos = 0;
+  Long l = 99;
+  LongFromArray(three, pos, l);
+  EXPECT_EQ(l, 99);
+  EXPECT_EQ(pos, 0);
+  ASSERT_EQ(log.entries.size(), 1u);
+  EXPECT_EQ(log.entries[0],
+            u"Error in SUB LongFromArray - Value = 0. 9-Subscript out of range. (KVData).");
+
+  // A Position below the lower bound.
+  const ByteArray loaded = stream_of({1, 2, 3, 4, 5, 6, 7, 8, 9}, 1);
+  pos = 0;
+  Date d{3.0};
+  DateFromArray(loaded, pos, d);
+  Integer i = 5;
+  pos = 9;
+  IntegerFromArray(loaded, pos, i);
+  Single f = 2.0f;
+  pos = -4;
+  SingleFromArray(loaded, pos, f);
+  EXPECT_EQ(d, Date{3.0});
+  EXPECT_EQ(i, 5);
+  EXPECT_EQ(f, 2.0f);
+  ASSERT_EQ(log.entries.size(), 4u);
+  EXPECT_EQ(
+      log.entries[1],
+      u"Error in SUB DateFromArray - Value = 1899-12-30. 9-Subscript out of range. (KVData).");
+  EXPECT_EQ(log.entries[2],
+            u"Error in SUB IntegerFromArray - Value = 0. 9-Subscript out of range. (KVData).");
+  EXPECT_EQ(log.entries[3],
+            u"Error in SUB SingleFromArray - Value = 0. 9-Subscript out of range. (KVData).");
+
+  // Writers into an array that was never given bounds: it is not created.
+  ByteArray none;
+  pos = 0;
+  LongToArray(5, none, pos);
+  IntegerToArray(-7, none, pos);
+  SingleToArray(1.5f, none, pos);
+  DateToArray(Date{45000.5}, none, pos);
+  BooleanToArray(true, none, pos);
+  EXPECT_FALSE(none.has_bounds());
+  EXPECT_EQ(pos, 0);
+  ASSERT_EQ(log.entries.size(), 9u);
+  EXPECT_EQ(log.entries[4],
+            u"Error in SUB LongToArray - Value = 5. 9-Subscript out of range. (KVData).");
+  EXPECT_EQ(log.entries[5],
+            u"Error in SUB IntegerToArray - Value = -7. 9-Subscript out of range. (KVData).");
+  EXPECT_EQ(log.entries[6],
+            u"Error in SUB SingleToArray - Value = 1.5. 9-Subscript out of range. (KVData).");
+  EXPECT_EQ(log.entries[7],
+            u"Error in SUB DateToArray - Value = 2023-03-15 12:00:00. "
+            u"9-Subscript out of range. (KVData).");
+  EXPECT_EQ(log.entries[8],
+            u"Error in SUB BooleanToArray - Value = True. 9-Subscript out of range. (KVData).");
+
+  // A writer's Position below the lower bound neither grows nor writes.
+  ByteArray small = stream_of({1, 2}, 5);
+  pos = 3;
+  LongToArray(-1, small, pos);
+  EXPECT_EQ(contents(small), (Bytes{1, 2}));
+  EXPECT_EQ(small.lbound(), 5);
+  EXPECT_EQ(pos, 3);
+  EXPECT_EQ(log.entries.size(), 10u);
+}
+
+TEST(FieldCodec, BooleanReaderEntryShowsTheCurrentValueAndPosition) {
+  LogCapture log;
+  const ByteArray stream = stream_of({1, 1, 1, 1, 1});
+  Long pos = 5;
+  bool b = true;
+  BooleanFromArray(stream, pos, b);
+  EXPECT_TRUE(b);
+  EXPECT_EQ(pos, 5);
+  ASSERT_EQ(log.entries.size(), 1u);
+  // No separator between the Position and the error number.
+  EXPECT_EQ(
+      log.entries[0],
+      u"Error in SUB BooleanFromArray - Value = True. SourceArray Position = 59-Subscript out "
+      u"of range. (KVData).");
+}
+
+TEST(FieldCodec, PositionOverflowIsAFailure) {
+  LogCapture log;
+  // Arrays whose indices reach the top of the Long range.
+  ByteArray top(kLongMax - 3, kLongMax);
+  Long pos = kLongMax - 3;
+  Long l = 1;
+  LongFromArray(top, pos, l);  // all four bytes exist, but Position + 4 does not
+  EXPECT_EQ(l, 1);
+  EXPECT_EQ(pos, kLongMax - 3);
+  bool b = false;
+  pos = kLongMax;
+  BooleanFromArray(top, pos, b);
+  EXPECT_EQ(pos, kLongMax);
+
+  ByteArray tail(kLongMax - 1, kLongMax - 1);
+  pos = kLongMax - 1;
+  LongToArray(7, tail, pos);
+  EXPECT_EQ(tail.ubound(), kLongMax - 1);
+  EXPECT_EQ(pos, kLongMax - 1);
+  ASSERT_EQ(log.entries.size(), 3u);
+  EXPECT_EQ(log.entries[0], u"Error in SUB LongFromArray - Value = 0. 6-Overflow. (KVData).");
+  EXPECT_EQ(log.entries[1],
+            u"Error in SUB BooleanFromArray - Value = False. SourceArray Position = "
+            u"21474836476-Overflow. (KVData).");
+  EXPECT_EQ(log.entries[2], u"Error in SUB LongToArray - Value = 7. 6-Overflow. (KVData).");
+}
+
+TEST(FieldCodec, StringReaderFailures) {
+  LogCapture log;
+  // A count of 10 with only 6 bytes after it: nothing beyond the array is read.
+  const ByteArray short_body = stream_of(Wire().l32(10).raw({'a', 'b', 'c', 'd', 'e', 'f'}).bytes);
+  Long pos = 0;
+  String value = u"keep";
+  StringFromArray(short_body, pos, value);
+  EXPECT_EQ(value, u"keep");
+  EXPECT_EQ(pos, 4);
+  ASSERT_EQ(log.entries.size(), 1u);
+  EXPECT_EQ(log.entries[0],
+            u"Calling CopyMemory - (StringFromArray - VIZuvuvadiRoruzu)\r\n"
+            u"Error in SUB StringFromArray - Value = keep. String Size = 10 9-Subscript out of "
+            u"range. (KVData).");
+
+  // Fewer than 4 bytes left: the count's own entry, and the empty string.
+  const ByteArray stub = stream_of({3, 0, 0});
+  pos = 0;
+  StringFromArray(stub, pos, value);
+  EXPECT_EQ(value, u"");
+  EXPECT_EQ(pos, 0);
+  ASSERT_EQ(log.entries.size(), 2u);
+  EXPECT_EQ(log.entries[1],
+            u"Error in SUB LongFromArray - Value = 0. 9-Subscript out of range. (KVData).");
+
+  // A negative count fails before any step is traced.
+  const ByteArray negative = stream_of(Wire().l32(-1).raw({'x'}).bytes);
+  pos = 0;
+  value = u"old";
+  StringFromArray(negative, pos, value);
+  EXPECT_EQ(value, u"old");
+  EXPECT_EQ(pos, 4);
+  ASSERT_EQ(log.entries.size(), 3u);
+  EXPECT_EQ(log.entries[2],
+            u"\r\nError in SUB StringFromArray - Value = old. String Size = -1 "
+            u"9-Subscript out of range. (KVData).");
+}
+
+TEST(FieldCodec, StringCountIsCheckedBeforeAllocating) {
+  LogCapture log;
+  for (const Long hostile : {kLongMax, kLongMax - 3, 1 << 30, 100000}) {
+    const ByteArray stream = stream_of(Wire().l32(hostile).str("padding").bytes);
+    Long pos = 0;
+    String value = u"v";
+    testing::reset_largest_allocation();
+    StringFromArray(stream, pos, value);
+    EXPECT_LT(testing::largest_allocation(), 4096u) << hostile;
+    EXPECT_EQ(value, u"v");
+    EXPECT_EQ(pos, 4);
+  }
+  EXPECT_EQ(log.entries.size(), 4u);
+}
+
+TEST(FieldCodec, StringWriterFailures) {
+  LogCapture log;
+  // No bounds: the count cannot be written, and nothing more is tried.
+  ByteArray none;
+  Long pos = 0;
+  StringToArray(u"abc", none, pos);
+  EXPECT_FALSE(none.has_bounds());
+  EXPECT_EQ(pos, 0);
+  ASSERT_EQ(log.entries.size(), 1u);
+  EXPECT_EQ(log.entries[0],
+            u"Error in SUB LongToArray - Value = 3. 9-Subscript out of range. (KVData).");
+
+  // The body would end past the Long range: the count stays written and
+  // Position just after it.
+  ByteArray top(kLongMax - 10, kLongMax - 10);
+  pos = kLongMax - 10;
+  StringToArray(u"abcdefghij", top, pos);
+  EXPECT_EQ(pos, kLongMax - 6);
+  EXPECT_EQ(top.ubound(), kLongMax - 7);
+  EXPECT_EQ(contents(top), (Bytes{10, 0, 0, 0}));
+  ASSERT_EQ(log.entries.size(), 2u);
+  EXPECT_EQ(log.entries[1],
+            u"Calling LongToArray - (StringToArray, VIZuvuvadiRoruzu)\r\n"
+            u"Error in SUB StringToArray - Value = abcdefghij. 6-Overflow. (KVData).");
+}
+
+TEST(FieldCodec, CheckedVariantsReportWhatThePublicOnesOnlyLog) {
+  LogCapture log;
+  ByteArray stream(0, -1);
+  Long pos = 0;
+  EXPECT_TRUE(checked::write_string(u"hi", stream, pos));
+  EXPECT_TRUE(checked::write_boolean(true, stream, pos));
+  ByteArray none;
+  Long zero = 0;
+  EXPECT_FALSE(checked::write_single(1.0f, none, zero));
+  EXPECT_EQ(log.entries.size(), 1u);
+
+  pos = 0;
+  String s;
+  bool b = false;
+  Long l = 0;
+  EXPECT_TRUE(checked::read_string(stream, pos, s));
+  EXPECT_TRUE(checked::read_boolean(stream, pos, b));
+  EXPECT_FALSE(checked::read_long(stream, pos, l));
+  s = u"x";
+  EXPECT_FALSE(checked::read_string(stream, pos, s));  // no count left
+  EXPECT_EQ(s, u"");
+  EXPECT_EQ(log.entries.size(), 3u);
+  EXPECT_EQ(pos, 7);
+}
+
+}  // namespace
+}  // namespace kvdata

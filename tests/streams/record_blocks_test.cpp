@@ -1,0 +1,191 @@
+#include <gtest/gtest.h>
+
+#include <string>
+#include <vector>
+
+#include "kvdata/kvdata.hpp"
+#include "streams/stream_test_support.hpp"
+
+namespace kvdata {
+namespace {
+
+using testing::contents;
+using testing::LogCapture;
+using testing::stream_of;
+using testing::Wire;
+using Bytes = std::vector<Byte>;
+
+constexpr auto kTo = eStreamDirection::ToStream;
+constexpr auto kFrom = eStreamDirection::FromStream;
+
+Streams& streams() {
+  return Streams::instance();
+}
+
+String blanks(std::size_t n) {
+  return String(n, u' ');
+}
+
+// Every text longer than its field or shorter than it.
+tUser user() {
+  tUser u;
+  u.USERID = u"ABCDEFGHIJ";  // cut to 8
+  u.UserNumber = 0x01020304;
+  u.LastName = u"Smith";                             // padded to 30
+  u.FirstName = u"Bartholomew-Maximilian-Johannes";  // 31, cut to 30
+  u.UserPWD = u"pw";
+  u.UserMail = u"a@b.c";
+  u.OrgID = -2;
+  u.RoleCode = u"AB";  // cut to 1
+  u.Disabled = u"Y";
+  return u;
+}
+
+Wire expected_user_block() {
+  Wire w;
+  w.units(u"ABCDEFGH").l32(0x01020304);
+  w.units(u"Smith" + blanks(25));
+  w.units(u"Bartholomew-Maximilian-Johanne");
+  w.units(u"pw" + blanks(6));
+  w.units(u"a@b.c" + blanks(45));
+  w.l32(-2);
+  w.raw({'A'});  // the low byte of RoleCode ends the block
+  return w;
+}
+
+TEST(RecordBlocks, UserIsTheFirst261BytesOfItsFlatImage) {
+  tUser u = user();
+  ByteArray stream(0, 299);
+  Long pos = 10;
+  ASSERT_TRUE(streams().Stream_User(kTo, stream, pos, u));
+  EXPECT_EQ(pos, 271);
+  EXPECT_EQ(stream.ubound(), 299);  // blocks never grow or shrink the stream
+  const Bytes block(stream.begin() + 10, stream.begin() + 271);
+  const Wire w = expected_user_block();
+  ASSERT_EQ(w.size(), 261u);
+  EXPECT_EQ(block, w.bytes);
+  // Offsets of the layout: UserNumber at 16, LastName at 20, OrgID at 256.
+  EXPECT_EQ(Bytes(block.begin() + 16, block.begin() + 22), (Bytes{0x04, 0x03, 0x02, 0x01, 'S', 0}));
+  EXPECT_EQ(Bytes(block.begin() + 254, block.end()), (Bytes{' ', 0, 0xFE, 0xFF, 0xFF, 0xFF, 'A'}));
+
+  tUser back;
+  pos = 10;
+  ASSERT_TRUE(streams().Stream_User(kFrom, stream, pos, back));
+  EXPECT_EQ(pos, 271);
+  EXPECT_EQ(back.USERID, u"ABCDEFGH");
+  EXPECT_EQ(back.UserNumber, 0x01020304);
+  EXPECT_EQ(back.LastName, u"Smith");
+  EXPECT_EQ(back.FirstName, u"Bartholomew-Maximilian-Johanne");
+  EXPECT_EQ(back.UserPWD, u"pw");
+  EXPECT_EQ(back.UserMail, u"a@b.c");
+  EXPECT_EQ(back.OrgID, -2);
+  EXPECT_EQ(back.RoleCode, u"A");
+  EXPECT_EQ(back.Disabled, String(1, u'\0'));  // Disabled does not travel
+}
+
+TEST(RecordBlocks, UserTextsAreTrimmedOfBlanksOnly) {
+  tUser u;
+  u.USERID = u"  id";
+  u.LastName = String(u"a\0b", 3);
+  u.RoleCode = u"\u0141";  // only the low byte 0x41 travels
+  ByteArray stream(0, 260);
+  Long pos = 0;
+  ASSERT_TRUE(streams().Stream_User(kTo, stream, pos, u));
+  tUser back;
+  pos = 0;
+  ASSERT_TRUE(streams().Stream_User(kFrom, stream, pos, back));
+  EXPECT_EQ(back.USERID, u"id");
+  EXPECT_EQ(back.LastName, String(u"a\0b", 3));
+  EXPECT_EQ(back.RoleCode, u"A");
+  EXPECT_EQ(back.FirstName, u"");
+}
+
+TEST(RecordBlocks, UserBlockInAShortStream) {
+  tUser u = user();
+  ByteArray stream(0, 99);
+  Long pos = 0;
+  EXPECT_FALSE(streams().Stream_User(kTo, stream, pos, u));
+  EXPECT_EQ(pos, 100);
+  EXPECT_EQ(stream.ubound(), 99);
+  const Wire w = expected_user_block();
+  EXPECT_EQ(contents(stream), Bytes(w.bytes.begin(), w.bytes.begin() + 100));
+
+  ByteArray none;
+  pos = 0;
+  EXPECT_FALSE(streams().Stream_User(kTo, none, pos, u));
+  EXPECT_FALSE(none.has_bounds());
+  EXPECT_EQ(pos, 0);
+
+  // Reading: every cut leaves the record unchanged and consumes what was there.
+  for (std::size_t cut = 0; cut < 261; ++cut) {
+    ByteArray part = stream_of(Bytes(w.bytes.begin(), w.bytes.begin() + static_cast<long>(cut)), 1);
+    tUser back = u;
+    pos = 1;
+    EXPECT_FALSE(streams().Stream_User(kFrom, part, pos, back)) << cut;
+    EXPECT_EQ(back, u) << cut;
+    EXPECT_EQ(pos, 1 + static_cast<Long>(cut)) << cut;
+  }
+}
+
+tOrganization organization() {
+  return tOrganization{
+      7, u"Kelvanto Calibration Laboratories of the Northern Region, Ltd", 1, -1, u"KL", u"Y"};
+}
+
+Wire expected_organization_block() {
+  Wire w;
+  w.l32(7).units(u"Kelvanto Calibration Laboratories of the Northern ");  // cut to 50
+  w.l32(1).l32(-1).units(u"KL" + blanks(6)).units(u"Y").zeros(3);
+  return w;
+}
+
+TEST(RecordBlocks, OrganizationIs133Bytes) {
+  tOrganization org = organization();
+  ByteArray stream(0, 2 * 133 - 1);
+  Long pos = 0;
+  ASSERT_TRUE(streams().StreamOrgTo(org, stream, pos));
+  EXPECT_EQ(pos, 133);
+  ASSERT_TRUE(streams().Stream_Organization(kTo, stream, pos, org));
+  EXPECT_EQ(pos, 266);
+  const Wire w = expected_organization_block();
+  ASSERT_EQ(w.size(), 133u);
+  EXPECT_EQ(Bytes(stream.begin(), stream.begin() + 133), w.bytes);
+  EXPECT_EQ(Bytes(stream.begin() + 133, stream.end()), w.bytes);
+  EXPECT_EQ(Bytes(stream.begin() + 104, stream.begin() + 114),
+            (Bytes{0x01, 0, 0, 0, 0xFF, 0xFF, 0xFF, 0xFF, 'K', 0}));
+
+  // The reader ignores the three trailing bytes.
+  stream(130) = 0xAA;
+  stream(132) = 0xBB;
+  tOrganization back;
+  pos = 0;
+  ASSERT_TRUE(streams().StreamOrgFrom(back, stream, pos));
+  EXPECT_EQ(pos, 133);
+  EXPECT_EQ(back, (tOrganization{7, u"Kelvanto Calibration Laboratories of the Northern", 1, -1,
+                                 u"KL", u"Y"}));
+  tOrganization again;
+  ASSERT_TRUE(streams().Stream_Organization(kFrom, stream, pos, again));
+  EXPECT_EQ(again, back);
+}
+
+TEST(RecordBlocks, OrganizationInAShortStreamIsFalse) {
+  LogCapture log;
+  tOrganization org = organization();
+  ByteArray stream(0, 49);
+  Long pos = 0;
+  EXPECT_FALSE(streams().Stream_Organization(kTo, stream, pos, org));
+  EXPECT_EQ(pos, 50);
+  const Wire w = expected_organization_block();
+  EXPECT_EQ(contents(stream), Bytes(w.bytes.begin(), w.bytes.begin() + 50));
+  tOrganization back = org;
+  pos = 0;
+  EXPECT_FALSE(streams().Stream_Organization(kFrom, stream, pos, back));
+  EXPECT_EQ(back, org);
+  EXPECT_EQ(pos, 50);
+  EXPECT_FALSE(streams().StreamOrgFrom(back, stream, pos));
+  EXPECT_EQ(pos, 50);
+  EXPECT_TRUE(log.entries.empty());  // blocks do not go through the codec
+}
+
+}  // namespace
+}  // namespace kvdata

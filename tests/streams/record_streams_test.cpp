@@ -1,0 +1,429 @@
+#include <gtest/gtest.h>
+
+#include <string>
+#include <vector>
+
+#include "kvdata/kvdata.hpp"
+#include "streams/stream_test_support.hpp"
+
+namespace kvdata {
+namespace {
+
+using testing::contents;
+using testing::LogCapture;
+using testing::put;
+using testing::sc_pair;
+using testing::spectrum;
+using testing::stream_of;
+using testing::Wire;
+using Bytes = std::vector<Byte>;
+
+constexpr auto kTo = eStreamDirection::ToStream;
+constexpr auto kFrom = eStreamDirection::FromStream;
+
+Streams& streams() {
+  return Streams::instance();
+}
+
+TEST(Streams, IsCreatableAndHasOnePredeclaredInstance) {
+  auto created = query<Streams>(CreateObject(u"KVData.Streams"));
+  ASSERT_NE(created, nullptr);
+  EXPECT_NE(created.get(), &Streams::instance());
+  EXPECT_EQ(&Streams::instance(), &Streams::instance());
+}
+
+TEST(Streams, AnyOtherDirectionDoesNothing) {
+  LogCapture log;
+  const auto other = static_cast<eStreamDirection>(2);
+  ByteArray stream = stream_of({9, 9});
+  const ByteArray before = stream;
+  Long pos = 0;
+  tSCPair pair = sc_pair(1);
+  tTileSet ts;
+  tTileSetCalibration tsc;
+  tOVProfile pro;
+  tStation st;
+  tTestRun1 tr;
+  tUser user;
+  tOrganization org;
+  EXPECT_FALSE(streams().Stream_SCPair(other, stream, pos, pair));
+  EXPECT_FALSE(streams().Stream_TileSetCalibration(other, stream, pos, ts, tsc));
+  EXPECT_FALSE(streams().Stream_Profile(other, stream, pos, pro));
+  EXPECT_FALSE(streams().Stream_Station(other, stream, pos, st));
+  EXPECT_FALSE(streams().Stream_TestRun(other, stream, pos, tr));
+  EXPECT_FALSE(streams().Stream_User(other, stream, pos, user));
+  EXPECT_FALSE(streams().Stream_Organization(static_cast<eStreamDirection>(-1), stream, pos, org));
+  EXPECT_EQ(stream, before);
+  EXPECT_EQ(pos, 0);
+  EXPECT_EQ(pair, sc_pair(1));
+  EXPECT_TRUE(log.entries.empty());
+}
+
+TEST(Streams, SCPairIsEightySinglesSCEFirst) {
+  tSCPair pair = sc_pair(10);
+  ByteArray stream(0, 0);
+  Long pos = 0;
+  ASSERT_TRUE(streams().Stream_SCPair(kTo, stream, pos, pair));
+  EXPECT_EQ(pos, 320);
+  EXPECT_EQ(stream.lbound(), 0);
+  EXPECT_EQ(stream.ubound(), 319);
+  Wire expected;
+  put(expected, pair);
+  EXPECT_EQ(contents(stream), expected.bytes);
+  // Spectrum(SCE).Data(1) = 10.25 at offset 0, Spectrum(SCI).Data(1) = 1010.25 at 160.
+  EXPECT_EQ(Bytes(stream.begin(), stream.begin() + 4), (Bytes{0x00, 0x00, 0x24, 0x41}));
+  EXPECT_EQ(Bytes(stream.begin() + 160, stream.begin() + 164), (Bytes{0x00, 0x90, 0x7C, 0x44}));
+
+  tSCPair back;
+  pos = 0;
+  ASSERT_TRUE(streams().Stream_SCPair(kFrom, stream, pos, back));
+  EXPECT_EQ(back, pair);
+  EXPECT_EQ(pos, 320);
+}
+
+TEST(Streams, SCPairReaderStopsAtTheFirstMissingValue) {
+  LogCapture log;
+  Wire w;
+  for (int j = 1; j <= 10; ++j) w.f32(static_cast<float>(-j));
+  ByteArray stream = stream_of(w.raw({1, 2}).bytes);
+  tSCPair pair = sc_pair(5);
+  Long pos = 0;
+  EXPECT_FALSE(streams().Stream_SCPair(kFrom, stream, pos, pair));
+  // The values read are stored, the rest keep what they held.
+  EXPECT_EQ(pair.Spectrum(eSC::SCE).Data(10), -10.0f);
+  EXPECT_EQ(pair.Spectrum(eSC::SCE).Data(11), sc_pair(5).Spectrum(eSC::SCE).Data(11));
+  EXPECT_EQ(pair.Spectrum(eSC::SCI), sc_pair(5).Spectrum(eSC::SCI));
+  EXPECT_EQ(pos, 40);
+  ASSERT_EQ(log.entries.size(), 1u);
+  EXPECT_EQ(log.entries[0],
+            u"Error in SUB SingleFromArray - Value = 0. 9-Subscript out of range. (KVData).");
+}
+
+TEST(Streams, RecordWritersReportValuesTheyCouldNotWrite) {
+  LogCapture log;
+  tSCPair pair = sc_pair(1);
+  tStation st{u"g", u"n", u"m"};
+  ByteArray none;
+  Long pos = 0;
+  EXPECT_FALSE(streams().Stream_SCPair(kTo, none, pos, pair));
+  EXPECT_FALSE(streams().Stream_Station(kTo, none, pos, st));
+  EXPECT_FALSE(none.has_bounds());
+  EXPECT_EQ(pos, 0);
+  ByteArray loaded = stream_of({0}, 1);
+  EXPECT_FALSE(streams().Stream_Station(kTo, loaded, pos, st));  // Position 0 is below the array
+  EXPECT_EQ(contents(loaded), Bytes{0});
+  EXPECT_EQ(log.entries.size(), 3u);  // one per operation: each stops at its first failure
+}
+
+TEST(Streams, StationIsThreeStrings) {
+  tStation st{u"{0A1B}", u"Lab 2", u""};
+  ByteArray stream(0, -1);
+  Long pos = 0;
+  ASSERT_TRUE(streams().Stream_Station(kTo, stream, pos, st));
+  EXPECT_EQ(contents(stream), (Bytes{0x06, 0, 0, 0, '{', '0', 'A', '1', 'B', '}',  //
+                                     0x05, 0, 0, 0, 'L', 'a', 'b', ' ', '2',       //
+                                     0x00, 0, 0, 0}));
+  tStation back{u"x", u"y", u"z"};
+  pos = 0;
+  ASSERT_TRUE(streams().Stream_Station(kFrom, stream, pos, back));
+  EXPECT_EQ(back, st);
+  EXPECT_EQ(pos, 23);
+}
+
+TEST(Streams, StationReaderKeepsWhatItReadBeforeTheStreamEnded) {
+  LogCapture log;
+  ByteArray stream = stream_of(Wire().str("guid").bytes);
+  tStation st{u"a", u"b", u"c"};
+  Long pos = 0;
+  EXPECT_FALSE(streams().Stream_Station(kFrom, stream, pos, st));
+  EXPECT_EQ(st.StationGUID, u"guid");
+  EXPECT_EQ(st.StationName, u"");   // a count that cannot be read yields the empty string
+  EXPECT_EQ(st.StationMail, u"c");  // not attempted
+  EXPECT_EQ(pos, 8);
+  EXPECT_EQ(log.entries.size(), 1u);
+}
+
+// --- Tile set with calibration ---------------------------------------------
+
+tTileSet tile_set(Long lower, Long upper, const String& tsn = u"TS-7") {
+  tTileSet ts;
+  ts.TSN = tsn;
+  ts.Tiles.redim(lower, upper);
+  for (Long i = lower; i <= upper; ++i) {
+    ts.Tiles(i).Name = u"Tile" + std::u16string(1, static_cast<char16_t>(u'A' + i - lower));
+    ts.Tiles(i).ColorRGB = 0x010203 * (i + 1);
+    ts.Tiles(i).TempComp = spectrum(static_cast<float>(i) * 100);
+  }
+  return ts;
+}
+
+tTileSetCalibration calibration(Long lower, Long upper, const String& tsn = u"TS-7") {
+  tTileSetCalibration tsc;
+  tsc.TSN = tsn;
+  tsc.Certified = Date{45000.25};
+  tsc.TempCalibrated = 23.5f;
+  tsc.Tiles.redim(lower, upper);
+  for (Long i = lower; i <= upper; ++i) tsc.Tiles(i) = sc_pair(static_cast<float>(i) * 10 + 2000);
+  return tsc;
+}
+
+Wire expected_tile_set(const tTileSet& ts, const tTileSetCalibration& tsc) {
+  Wire w;
+  w.str("TS-7").l32(static_cast<std::int32_t>(ts.Tiles.size()));
+  for (const tTileDef& tile : ts.Tiles) {
+    w.str(to_utf8(tile.Name)).l32(tile.ColorRGB);
+    put(w, tile.TempComp);
+  }
+  w.f64(tsc.Certified.days).f32(tsc.TempCalibrated);
+  for (const tSCPair& pair : tsc.Tiles) put(w, pair);
+  return w;
+}
+
+TEST(Streams, TileSetWithCalibrationAtBoundsZeroToTwelve) {
+  tTileSet ts = tile_set(0, 12);
+  tTileSetCalibration tsc = calibration(0, 12);
+  ByteArray stream(0, -1);
+  Long pos = 0;
+  ASSERT_TRUE(streams().Stream_TileSetCalibration(kTo, stream, pos, ts, tsc));
+  const Wire expected = expected_tile_set(ts, tsc);
+  EXPECT_EQ(contents(stream), expected.bytes);
+  EXPECT_EQ(pos, static_cast<Long>(expected.size()));
+  // Serial number, then the count 13.
+  EXPECT_EQ(Bytes(stream.begin(), stream.begin() + 12),
+            (Bytes{0x04, 0, 0, 0, 'T', 'S', '-', '7', 0x0D, 0, 0, 0}));
+
+  tTileSet ts_back;
+  tTileSetCalibration tsc_back;
+  pos = 0;
+  ASSERT_TRUE(streams().Stream_TileSetCalibration(kFrom, stream, pos, ts_back, tsc_back));
+  EXPECT_EQ(pos, static_cast<Long>(expected.size()));
+  EXPECT_EQ(ts_back.Tiles.lbound(), 1);
+  EXPECT_EQ(ts_back.Tiles.ubound(), 13);
+  EXPECT_EQ(tsc_back.Tiles.lbound(), 1);
+  EXPECT_EQ(tsc_back.Tiles.ubound(), 13);
+  tTileSet ts_renumbered{ts.TSN, Array<tTileDef>(1, 13)};
+  tTileSetCalibration tsc_renumbered = tsc;
+  tsc_renumbered.Tiles.redim(1, 13);
+  for (Long i = 1; i <= 13; ++i) {
+    ts_renumbered.Tiles(i) = ts.Tiles(i - 1);
+    tsc_renumbered.Tiles(i) = tsc.Tiles(i - 1);
+  }
+  EXPECT_EQ(ts_back, ts_renumbered);
+  EXPECT_EQ(tsc_back, tsc_renumbered);
+}
+
+TEST(Streams, TileSetWriterRefusesBeforeWritingAnything) {
+  LogCapture log;
+  ByteArray stream = stream_of({7});
+  Long pos = 1;
+  auto refused = [&](tTileSet ts, tTileSetCalibration tsc) {
+    const bool result = streams().Stream_TileSetCalibration(kTo, stream, pos, ts, tsc);
+    EXPECT_EQ(contents(stream), Bytes{7});
+    EXPECT_EQ(pos, 1);
+    return !result;
+  };
+  EXPECT_TRUE(refused(tile_set(0, 12, u"TS-7"), calibration(0, 12, u"ts-7")));  // letter case
+  EXPECT_TRUE(refused(tTileSet{u"TS-7", {}}, calibration(0, 12)));              // no bounds
+  EXPECT_TRUE(refused(tile_set(0, 12), calibration(0, 11)));                    // index 12 missing
+  EXPECT_TRUE(refused(tile_set(0, 12), tTileSetCalibration{u"TS-7", {}, 0, {}}));
+  EXPECT_TRUE(refused(tile_set(0, 254), calibration(0, 254)));  // 255 tiles: unreadable
+  EXPECT_TRUE(refused(tile_set(1, 255), calibration(1, 255)));  // beyond the 8-bit counter
+  EXPECT_TRUE(refused(tile_set(-1, 3), calibration(-1, 3)));
+  EXPECT_TRUE(refused(tile_set(5, 4), calibration(5, 4)));  // no tiles: unreadable
+  EXPECT_TRUE(log.entries.empty());
+
+  // The limits themselves are accepted.
+  tTileSet largest = tile_set(1, 254);
+  tTileSetCalibration largest_calibration = calibration(1, 254);
+  EXPECT_TRUE(streams().Stream_TileSetCalibration(kTo, stream, pos, largest, largest_calibration));
+}
+
+TEST(Streams, TileSetReaderRefusesCountsAndShortStreams) {
+  LogCapture log;
+  const tTileSet ts_before = tile_set(0, 2, u"old");
+  const tTileSetCalibration tsc_before = calibration(0, 2, u"old");
+  auto read = [&](const Bytes& bytes) {
+    tTileSet ts = ts_before;
+    tTileSetCalibration tsc = tsc_before;
+    ByteArray stream = stream_of(bytes);
+    Long pos = 0;
+    testing::reset_largest_allocation();
+    const bool ok = streams().Stream_TileSetCalibration(kFrom, stream, pos, ts, tsc);
+    EXPECT_EQ(ts, ts_before);
+    EXPECT_EQ(tsc, tsc_before);
+    EXPECT_LT(testing::largest_allocation(), 65536u);
+    return ok;
+  };
+  const Bytes padding(2000, 0);
+  auto with_count = [&](std::int32_t n) {
+    Wire w;
+    w.str("TS-7").l32(n);
+    w.bytes.insert(w.bytes.end(), padding.begin(), padding.end());
+    return w.bytes;
+  };
+  EXPECT_FALSE(read(with_count(0)));
+  EXPECT_FALSE(read(with_count(-3)));
+  EXPECT_FALSE(read(with_count(255)));
+  EXPECT_FALSE(read(with_count(0x7FFFFFFF)));
+  EXPECT_FALSE(read(with_count(5)));  // five tiles need more than 2000 bytes
+  EXPECT_TRUE(log.entries.empty());   // refused before reading any tile
+
+  // A stream cut anywhere reads back False, one entry at most, records unchanged.
+  tTileSet ts = tile_set(0, 1);
+  tTileSetCalibration tsc = calibration(0, 1);
+  ByteArray full(0, -1);
+  Long pos = 0;
+  ASSERT_TRUE(streams().Stream_TileSetCalibration(kTo, full, pos, ts, tsc));
+  const Bytes bytes = contents(full);
+  for (std::size_t cut = 0; cut < bytes.size(); ++cut) {
+    log.entries.clear();
+    EXPECT_FALSE(read(Bytes(bytes.begin(), bytes.begin() + static_cast<long>(cut)))) << cut;
+    EXPECT_LE(log.entries.size(), 1u) << cut;
+  }
+}
+
+// --- Profile ----------------------------------------------------------------
+
+tOVProfileDataV1 profile_tables() {
+  tOVProfileDataV1 t;
+  for (Long k = 0; k <= 1; ++k) {
+    t.wCal(k) = spectrum(static_cast<float>(k) * 1000 + 100);
+    t.wave(k) = spectrum(static_cast<float>(k) * 1000 + 200);
+    t.Linear(k) = spectrum(static_cast<float>(k) * 1000 + 300);
+    t.Dark(k) = spectrum(static_cast<float>(k) * 1000 + 400);
+  }
+  return t;
+}
+
+tOVProfile profile() {
+  tOVProfile pro;
+  pro.ISN = u"SN42";
+  pro.Created = Date{45123.5};
+  pro.Validated = true;
+  pro.ProfileData = Variant(profile_tables());
+  return pro;
+}
+
+TEST(Streams, ProfileCarriesItsTypeNameAndInterleavedTables) {
+  tOVProfile pro = profile();
+  ByteArray stream(0, -1);
+  Long pos = 0;
+  ASSERT_TRUE(streams().Stream_Profile(kTo, stream, pos, pro));
+  const tOVProfileDataV1 t = profile_tables();
+  Wire expected;
+  expected.str("SN42").f64(45123.5).boolean(true).str("tOVProfileDataV1");
+  for (Long k = 0; k <= 1; ++k) {
+    for (Long band = 1; band <= 40; ++band) {
+      expected.f32(t.wCal(k).Data(band)).f32(t.wave(k).Data(band));
+      expected.f32(t.Linear(k).Data(band)).f32(t.Dark(k).Data(band));
+    }
+  }
+  EXPECT_EQ(contents(stream), expected.bytes);
+  EXPECT_EQ(pos, 8 + 8 + 1 + 20 + 1280);
+  // The type name as L 16 and 16 bytes, then wCal(0)(1) = 100.25, wave(0)(1) = 200.25.
+  EXPECT_EQ(Bytes(stream.begin() + 17, stream.begin() + 45),
+            (Bytes{0x10, 0,   0,   0,   't', 'O', 'V',  'P',  'r',  'o',  'f',  'i',  'l',  'e',
+                   'D',  'a', 't', 'a', 'V', '1', 0x00, 0x80, 0xC8, 0x42, 0x00, 0x40, 0x48, 0x43}));
+
+  tOVProfile back;
+  pos = 0;
+  ASSERT_TRUE(streams().Stream_Profile(kFrom, stream, pos, back));
+  EXPECT_EQ(back, pro);
+  EXPECT_EQ(pos, static_cast<Long>(expected.size()));
+}
+
+TEST(Streams, ProfileWriterNeedsItsTables) {
+  ByteArray stream(0, -1);
+  Long pos = 0;
+  tOVProfile pro = profile();
+  pro.ProfileData = Variant();
+  EXPECT_FALSE(streams().Stream_Profile(kTo, stream, pos, pro));
+  pro.ProfileData = Variant(String(u"tOVProfileDataV1"));
+  EXPECT_FALSE(streams().Stream_Profile(kTo, stream, pos, pro));
+  EXPECT_EQ(stream.ubound(), -1);
+  EXPECT_EQ(pos, 0);
+}
+
+TEST(Streams, ProfileReaderChecksTheTypeNameAfterStoringTheHeader) {
+  LogCapture log;
+  tOVProfile pro = profile();
+  pro.ISN = u"old";
+  const Variant old_tables = pro.ProfileData;
+  Wire w;
+  w.str("NEW").f64(7.0).boolean(false).str("tOVProfileDataV2");
+  for (int k = 0; k < 320; ++k) w.f32(1.0f);
+  ByteArray stream = stream_of(w.bytes);
+  Long pos = 0;
+  EXPECT_FALSE(streams().Stream_Profile(kFrom, stream, pos, pro));
+  EXPECT_EQ(pro.ISN, u"NEW");
+  EXPECT_EQ(pro.Created, Date{7.0});
+  EXPECT_FALSE(pro.Validated);
+  EXPECT_EQ(pro.ProfileData, old_tables);
+
+  // Tables cut short: ProfileData is not replaced, one entry.
+  Wire cut;
+  cut.str("NEW").f64(7.0).boolean(true).str("tOVProfileDataV1").f32(9.0f);
+  stream = stream_of(cut.bytes);
+  pos = 0;
+  EXPECT_FALSE(streams().Stream_Profile(kFrom, stream, pos, pro));
+  EXPECT_TRUE(pro.Validated);
+  EXPECT_EQ(pro.ProfileData, old_tables);
+  EXPECT_EQ(log.entries.size(), 1u);
+}
+
+}  // namespace
+}  // namespace kvdata
+
+namespace kvdata {
+namespace {
+
+// Every writer's output reads back to an equal record, one record after
+// another in one stream, here in a stream loaded with lower bound 1.
+TEST(Streams, EveryRecordReadsBackFromOneSharedStream) {
+  LogCapture log;
+  tSCPair pair = sc_pair(3);
+  tTileSet ts = tile_set(1, 13);
+  tTileSetCalibration tsc = calibration(1, 13);
+  tOVProfile pro = profile();
+  tStation st{u"{S}", u"Station \u00e9", u"s@x"};
+  tUser user{u"id", 5, u"Last", u"First", u"pwd", u"m@x", 9, u"R", u""};
+  tOrganization org{3, u"Org", 2, 1, u"O", u"Y"};
+  ByteArray stream(1, 1);
+  Long pos = 1;
+  ASSERT_TRUE(streams().Stream_SCPair(kTo, stream, pos, pair));
+  ASSERT_TRUE(streams().Stream_TileSetCalibration(kTo, stream, pos, ts, tsc));
+  ASSERT_TRUE(streams().Stream_Profile(kTo, stream, pos, pro));
+  ASSERT_TRUE(streams().Stream_Station(kTo, stream, pos, st));
+  stream.redim_preserve(1, pos + 261 + 133 - 1);  // blocks need their room
+  ASSERT_TRUE(streams().Stream_User(kTo, stream, pos, user));
+  ASSERT_TRUE(streams().Stream_Organization(kTo, stream, pos, org));
+  EXPECT_EQ(pos, stream.ubound() + 1);
+
+  tSCPair pair_back;
+  tTileSet ts_back;
+  tTileSetCalibration tsc_back;
+  tOVProfile pro_back;
+  tStation st_back;
+  tUser user_back;
+  tOrganization org_back;
+  pos = 1;
+  ASSERT_TRUE(streams().Stream_SCPair(kFrom, stream, pos, pair_back));
+  ASSERT_TRUE(streams().Stream_TileSetCalibration(kFrom, stream, pos, ts_back, tsc_back));
+  ASSERT_TRUE(streams().Stream_Profile(kFrom, stream, pos, pro_back));
+  ASSERT_TRUE(streams().Stream_Station(kFrom, stream, pos, st_back));
+  ASSERT_TRUE(streams().Stream_User(kFrom, stream, pos, user_back));
+  ASSERT_TRUE(streams().Stream_Organization(kFrom, stream, pos, org_back));
+  EXPECT_EQ(pair_back, pair);
+  EXPECT_EQ(ts_back, ts);
+  EXPECT_EQ(tsc_back, tsc);
+  EXPECT_EQ(pro_back, pro);
+  EXPECT_EQ(st_back, st);
+  user.Disabled = String(1, u'\0');
+  EXPECT_EQ(user_back, user);
+  EXPECT_EQ(org_back, org);
+  EXPECT_EQ(pos, stream.ubound() + 1);
+  EXPECT_TRUE(log.entries.empty());
+}
+
+}  // namespace
+}  // namespace kvdata

@@ -1,0 +1,247 @@
+#include <gtest/gtest.h>
+
+#include <vector>
+
+#include "kvdata/kvdata.hpp"
+#include "streams/stream_test_support.hpp"
+
+namespace kvdata {
+namespace {
+
+using testing::contents;
+using testing::LogCapture;
+using testing::put;
+using testing::sc_pair;
+using testing::spectrum;
+using testing::stream_of;
+using testing::Wire;
+using Bytes = std::vector<Byte>;
+
+constexpr auto kTo = eStreamDirection::ToStream;
+constexpr auto kFrom = eStreamDirection::FromStream;
+
+Streams& streams() {
+  return Streams::instance();
+}
+
+tTestStats stats(eTestResult result, const String& explain, double start) {
+  return tTestStats{result, explain, Date{start}, Date{start + 0.5}};
+}
+
+tIIATileSet series(Long tiles, double profile, float base) {
+  tIIATileSet s;
+  s.Profile = Date{profile};
+  if (tiles > 0) s.Tiles.redim(1, tiles);
+  for (Long i = 1; i <= tiles; ++i) {
+    s.Tiles(i).Trial = sc_pair(base + static_cast<float>(i) * 10);
+    s.Tiles(i).TrialProfiled = sc_pair(base + static_cast<float>(i) * 10 + 5000);
+  }
+  return s;
+}
+
+// A test run with a distinct value in every streamed field, and light-level
+// spectra (which do not travel).
+tTestRun1 test_run(bool two_series) {
+  tTestRun1 tr;
+  tr.ISN = u"ISN-1";
+  tr.UserNumber = 77;
+  tr.StationGUID = u"{G}";
+  tr.TestDate = Date{45000.0};
+  tr.Comment = u"ok";
+  tr.Stats = stats(eTestResult::Pass, u"all", 1.0);
+  tr.CommunicationsTest = stats(eTestResult::Certified, u"com", 2.0);
+  tr.LightLevels.Stats = stats(eTestResult::Fail, u"ll", 3.0);
+  for (Long i = 1; i <= 8; ++i) tr.LightLevels.LightLevels(i) = spectrum(static_cast<float>(i));
+  tTUD_Repeatability& rep = tr.Repeatability;
+  rep.Stats = stats(eTestResult::NA, u"rep", 4.0);
+  rep.BlueTileStdDev = spectrum(300);
+  rep.BlueTileMaxdE = 1.0f;
+  rep.BlueTileRMSdE = 2.0f;
+  rep.BlueTileDriftdE = 3.0f;
+  rep.WhiteTileStdDev = spectrum(400);
+  rep.WhiteTileMaxdE = 4.0f;
+  rep.WhiteTileRMSdE = 5.0f;
+  rep.WhiteTileDriftdE = 6.0f;
+  tr.IIA.Stats = stats(eTestResult::Pass, u"iia", 5.0);
+  tr.IIA.TSN = u"TS-9";
+  tr.IIA.CalStandard = Date{44000.0};
+  tr.IIA.Has2Measurement = two_series;
+  tr.IIA.Measurements(1) = series(2, 43000.0, 100);
+  if (two_series) tr.IIA.Measurements(2) = series(1, 43001.0, 200);
+  return tr;
+}
+
+// The expected bytes, value by value in stream order.
+Wire expected(const tTestRun1& tr) {
+  Wire w;
+  auto put_stats = [&](const tTestStats& s) {
+    w.l32(static_cast<std::int32_t>(s.TestResult)).str(to_utf8(s.TestExplain));
+    w.f64(s.TestStart.days).f64(s.TestEnd.days);
+  };
+  w.str(to_utf8(tr.ISN)).l32(tr.UserNumber).str(to_utf8(tr.StationGUID)).f64(tr.TestDate.days);
+  w.str(to_utf8(tr.Comment));
+  put_stats(tr.Stats);
+  put_stats(tr.CommunicationsTest);
+  put_stats(tr.LightLevels.Stats);
+  put_stats(tr.Repeatability.Stats);
+  const auto& rep = tr.Repeatability;
+  put(w, rep.BlueTileStdDev).f32(rep.BlueTileMaxdE).f32(rep.BlueTileDriftdE).f32(rep.BlueTileRMSdE);
+  put(w, rep.WhiteTileStdDev)
+      .f32(rep.WhiteTileMaxdE)
+      .f32(rep.WhiteTileDriftdE)
+      .f32(rep.WhiteTileRMSdE);
+  put_stats(tr.IIA.Stats);
+  w.f64(tr.IIA.CalStandard.days).str(to_utf8(tr.IIA.TSN)).boolean(tr.IIA.Has2Measurement);
+  for (Long m = 1; m <= (tr.IIA.Has2Measurement ? 2 : 1); ++m) {
+    const tIIATileSet& s = tr.IIA.Measurements(m);
+    w.f64(s.Profile.days).i16(static_cast<std::int16_t>(s.Tiles.has_bounds() ? s.Tiles.size() : 0));
+    for (const tIIATile& tile : s.Tiles) {
+      for (Long k = 0; k <= 1; ++k) {
+        for (Long band = 1; band <= 40; ++band) {
+          w.f32(tile.Trial.Spectrum(k).Data(band)).f32(tile.TrialProfiled.Spectrum(k).Data(band));
+        }
+      }
+    }
+  }
+  return w;
+}
+
+// What a reader gives back: no light-level spectra.
+tTestRun1 as_read(tTestRun1 tr) {
+  tr.LightLevels.LightLevels = {};
+  return tr;
+}
+
+TEST(TestRunStream, OneSeriesInStreamOrder) {
+  tTestRun1 tr = test_run(false);
+  ByteArray stream(0, -1);
+  Long pos = 0;
+  ASSERT_TRUE(streams().Stream_TestRun(kTo, stream, pos, tr));
+  const Wire w = expected(tr);
+  EXPECT_EQ(contents(stream), w.bytes);
+  EXPECT_EQ(pos, static_cast<Long>(w.size()));
+
+  // The blue-tile scalars travel maximum, drift, RMS: 1, 3, 2. They follow
+  // ISN (9), UserNumber (4), StationGUID (7), TestDate (8), Comment (6),
+  // four statistics (4 + 7 + 16, 4 + 7 + 16, 4 + 6 + 16, 4 + 7 + 16) and
+  // 40 Singles.
+  const std::size_t blue = 9 + 4 + 7 + 8 + 6 + 27 + 27 + 26 + 27 + 160;
+  EXPECT_EQ(Bytes(stream.begin() + static_cast<long>(blue),
+                  stream.begin() + static_cast<long>(blue) + 12),
+            (Bytes{0x00, 0x00, 0x80, 0x3F, 0x00, 0x00, 0x40, 0x40, 0x00, 0x00, 0x00, 0x40}));
+  // After IIA.Stats: CalStandard, then TSN, then Has2Measurement False,
+  // then the series' Profile and its 16-bit tile count 2.
+  const std::size_t iia = blue + 12 + 160 + 12 + 27;
+  EXPECT_EQ(
+      Bytes(stream.begin() + static_cast<long>(iia), stream.begin() + static_cast<long>(iia) + 27),
+      (Bytes{0x00, 0x00, 0x00, 0x00, 0x00, 0x7C, 0xE5, 0x40,  // 44000
+             0x04, 0x00, 0x00, 0x00, 'T',  'S',  '-',  '9',   //
+             0x00,                                            // one series
+             0x00, 0x00, 0x00, 0x00, 0x00, 0xFF, 0xE4, 0x40,  // 43000
+             0x02, 0x00}));
+  EXPECT_EQ(stream.ubound() + 1, static_cast<Long>(iia + 27 + 2 * 640));
+
+  tTestRun1 back = test_run(true);  // replaced as a whole
+  pos = 0;
+  ASSERT_TRUE(streams().Stream_TestRun(kFrom, stream, pos, back));
+  EXPECT_EQ(back, as_read(tr));
+  EXPECT_FALSE(back.IIA.Measurements(2).Tiles.has_bounds());
+  EXPECT_EQ(back.LightLevels.LightLevels(8), tSpectrum{});
+}
+
+TEST(TestRunStream, TwoSeriesRoundTrip) {
+  tTestRun1 tr = test_run(true);
+  ByteArray stream(0, -1);
+  Long pos = 0;
+  ASSERT_TRUE(streams().Stream_TestRun(kTo, stream, pos, tr));
+  EXPECT_EQ(contents(stream), expected(tr).bytes);
+  tTestRun1 back;
+  pos = 0;
+  ASSERT_TRUE(streams().Stream_TestRun(kFrom, stream, pos, back));
+  EXPECT_EQ(back, as_read(tr));
+  EXPECT_EQ(back.IIA.Measurements(2).Tiles.ubound(), 1);
+  EXPECT_EQ(pos, stream.ubound() + 1);
+}
+
+TEST(TestRunStream, SeriesWithoutTilesTravelAsCountZero) {
+  // A new test run has no tiles in either series; it is written and read back.
+  tTestRun1 fresh;
+  fresh.IIA.Has2Measurement = true;
+  ByteArray stream(0, -1);
+  Long pos = 0;
+  ASSERT_TRUE(streams().Stream_TestRun(kTo, stream, pos, fresh));
+  const Bytes bytes = contents(stream);
+  // ... Has2Measurement, then (Profile 0, count 0) twice.
+  EXPECT_EQ(Bytes(bytes.end() - 21, bytes.end()),
+            (Bytes{0x01, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0}));
+  tTestRun1 back = test_run(true);
+  pos = 0;
+  ASSERT_TRUE(streams().Stream_TestRun(kFrom, stream, pos, back));
+  EXPECT_EQ(back, fresh);
+
+  // A negative count reads as a series without bounds too.
+  Bytes negative = bytes;
+  negative[negative.size() - 2] = 0xFF;
+  negative[negative.size() - 1] = 0xFF;
+  stream = stream_of(negative);
+  pos = 0;
+  ASSERT_TRUE(streams().Stream_TestRun(kFrom, stream, pos, back));
+  EXPECT_FALSE(back.IIA.Measurements(2).Tiles.has_bounds());
+}
+
+TEST(TestRunStream, WriterRefusesSeriesBeyondTheSixteenBitCounter) {
+  LogCapture log;
+  ByteArray stream(0, -1);
+  Long pos = 0;
+  tTestRun1 tr = test_run(true);
+  tr.IIA.Measurements(2).Tiles.redim(1, 32768);
+  EXPECT_FALSE(streams().Stream_TestRun(kTo, stream, pos, tr));
+  tr.IIA.Measurements(2).Tiles.redim(40000, 40001);
+  EXPECT_FALSE(streams().Stream_TestRun(kTo, stream, pos, tr));
+  EXPECT_EQ(stream.ubound(), -1);  // refused before the first byte
+  EXPECT_EQ(pos, 0);
+  // The second series is not checked when only one travels.
+  tr.IIA.Has2Measurement = false;
+  EXPECT_TRUE(streams().Stream_TestRun(kTo, stream, pos, tr));
+  ByteArray none;
+  pos = 0;
+  EXPECT_FALSE(streams().Stream_TestRun(kTo, none, pos, tr));
+  EXPECT_EQ(log.entries.size(), 1u);
+}
+
+TEST(TestRunStream, ReaderRefusesShortStreamsAndLeavesTheRecordUnchanged) {
+  LogCapture log;
+  tTestRun1 written = test_run(true);
+  ByteArray full(0, -1);
+  Long pos = 0;
+  ASSERT_TRUE(streams().Stream_TestRun(kTo, full, pos, written));
+  const Bytes bytes = contents(full);
+  const tTestRun1 before = test_run(false);
+  for (std::size_t cut = 0; cut < bytes.size(); ++cut) {
+    log.entries.clear();
+    ByteArray stream = stream_of(Bytes(bytes.begin(), bytes.begin() + static_cast<long>(cut)));
+    tTestRun1 tr = before;
+    pos = 0;
+    EXPECT_FALSE(streams().Stream_TestRun(kFrom, stream, pos, tr)) << cut;
+    EXPECT_EQ(tr, before) << cut;
+    EXPECT_LE(log.entries.size(), 1u) << cut;
+  }
+
+  // A tile count that cannot fit is refused before its tiles are allocated.
+  // Up to the first series' count: the second series (8 + 2 + 640), the
+  // first one's tiles (2 * 640) and its count (2) cut off.
+  Bytes hostile(bytes.begin(), bytes.end() - (8 + 2 + 640) - 2 * 640 - 2);
+  hostile.push_back(0xFF);
+  hostile.push_back(0x7F);  // 32767 tiles
+  hostile.resize(hostile.size() + 1000);
+  ByteArray stream = stream_of(hostile);
+  tTestRun1 tr = before;
+  pos = 0;
+  testing::reset_largest_allocation();
+  EXPECT_FALSE(streams().Stream_TestRun(kFrom, stream, pos, tr));
+  EXPECT_LT(testing::largest_allocation(), 100000u);
+  EXPECT_EQ(tr, before);
+}
+
+}  // namespace
+}  // namespace kvdata
