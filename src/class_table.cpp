@@ -1,6 +1,7 @@
 // The table of creatable classes, one line per class, in the order in which
 // the library lists them. Interface classes and facades are not creatable.
 #include "kvdata/automation/create_object.hpp"
+#include "kvdata/objects/db_manager.hpp"
 #include "kvdata/objects/kv_tol_set.hpp"
 #include "kvdata/objects/kv_tolerance.hpp"
 #include "kvdata/objects/kv_user.hpp"
@@ -18,6 +19,7 @@ constexpr CreatableClass kClasses[] = {
     {u"KVData.KVUser", &make<KVUser>},
     {u"KVData.KVTolerance", &make<KVTolerance>},
     {u"KVData.KVTolSet", &make<KVTolSet>},
+    {u"KVData.DBManager", &make<DBManager>},
     {u"KVData.Streams", &make<Streams>},
 };
 

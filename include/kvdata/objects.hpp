@@ -1,6 +1,8 @@
 #pragma once
-// The domain objects: users, tolerances and tolerance sets.
+// The domain objects: users, tolerances and tolerance sets; the root object
+// DBManager that creates them and hands out the data-access facades.
 
+#include "kvdata/objects/db_manager.hpp"
 #include "kvdata/objects/kv_tol_set.hpp"
 #include "kvdata/objects/kv_tolerance.hpp"
 #include "kvdata/objects/kv_user.hpp"
