@@ -1,6 +1,8 @@
 #include "kvdata/objects/db_manager.hpp"
 
 #include "kvdata/automation/text.hpp"
+#include "kvdata/objects/kv_calibration.hpp"
+#include "kvdata/objects/kv_tile_set.hpp"
 #include "kvdata/objects/kv_tol_set.hpp"
 
 namespace kvdata {
@@ -88,6 +90,8 @@ std::shared_ptr<IKVObj> DBManager::IKVObjCreator_Create(const String& ObjectType
     if (!tol_set_) tol_set_ = KVTolSet::create();
     return tol_set_;
   }
+  if (word == to_upper(u"TileSet")) return KVTileSet::create();
+  if (word == to_upper(u"Calibration")) return KVCalibration::create();
   return nullptr;
 }
 

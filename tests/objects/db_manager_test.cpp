@@ -67,6 +67,27 @@ TEST(DBManager, TolSetWordGivesTheOneSharedSet) {
   EXPECT_EQ(query<IKVTolSet>(other)->count(), 0);
 }
 
+TEST(DBManager, OtherWordsGiveNewObjectsOfTheirKind) {
+  auto manager = DBManager::create();
+
+  auto set1 = manager->Create(u"TileSet");
+  auto set2 = manager->Create(u"tileset");
+  ASSERT_NE(set1, nullptr);
+  ASSERT_NE(set2, nullptr);
+  EXPECT_NE(set1, set2);
+  EXPECT_EQ(set1->ObjType(), u"TileSet");
+  EXPECT_NE(std::dynamic_pointer_cast<KVTileSet>(set1), nullptr);
+  // Distinct sets: a change to one is not seen through the other.
+  query<IKVTileSet>(set1)->TSN(u"TS000042");
+  EXPECT_EQ(set1->ID().to_string(), u"TS000042");
+  EXPECT_EQ(set2->ID().to_string(), u"");
+
+  auto cal = manager->Create(u" CALIBRATION");
+  ASSERT_NE(cal, nullptr);
+  EXPECT_NE(std::dynamic_pointer_cast<KVCalibration>(cal), nullptr);
+  EXPECT_NE(manager->Create(u"Calibration"), cal);
+}
+
 TEST(DBManager, NearMissWordsGiveNoObject) {
   auto manager = DBManager::create();
   const String words[] = {
@@ -114,6 +135,8 @@ TEST(DBManager, ReleasedManagerLeavesHeldObjectsUsable) {
   // Objects the caller does not hold go with the manager.
   std::weak_ptr<Stations> stations = manager->DBStations();
   std::weak_ptr<Organizations> organizations = manager->DBOrganizations();
+  std::weak_ptr<IKVObj> tile_set = manager->Create(u"TileSet");
+  EXPECT_TRUE(tile_set.expired());
   EXPECT_FALSE(stations.expired());
 
   manager.reset();
