@@ -1,0 +1,136 @@
+#include "kvdata/automation/array.hpp"
+
+#include <gtest/gtest.h>
+
+#include "kvdata/foundation/enums.hpp"
+
+namespace kvdata {
+namespace {
+
+template <class F>
+Long error_number(F&& f) {
+  try {
+    f();
+  } catch (const Error& e) {
+    return e.number();
+  }
+  return 0;
+}
+
+TEST(Array, WithoutBoundsEveryQueryRaisesNine) {
+  Array<Long> a;
+  EXPECT_EQ(a.rank(), 0);
+  EXPECT_EQ(error_number([&] { (void)a.lbound(); }), kSubscriptOutOfRange);
+  EXPECT_EQ(error_number([&] { (void)a.ubound(); }), kSubscriptOutOfRange);
+  EXPECT_EQ(error_number([&] { (void)a(0); }), kSubscriptOutOfRange);
+
+  // Dimensioned with no elements is not the same as never dimensioned.
+  Array<Long> empty(0, -1);
+  EXPECT_EQ(empty.rank(), 1);
+  EXPECT_EQ(empty.ubound(), -1);
+  EXPECT_EQ(empty.size(), 0u);
+  EXPECT_FALSE(empty == a);
+}
+
+TEST(Array, OwnIndexRangesAreCheckedOnBothSides) {
+  Array<Single> a(1, 40);
+  EXPECT_EQ(a.lbound(), 1);
+  EXPECT_EQ(a.ubound(), 40);
+  EXPECT_EQ(a(1), 0.0f);
+  a(40) = 2.5f;
+  EXPECT_EQ(a.data()[39], 2.5f);
+  EXPECT_EQ(error_number([&] { (void)a(0); }), kSubscriptOutOfRange);
+  EXPECT_EQ(error_number([&] { (void)a(41); }), kSubscriptOutOfRange);
+  EXPECT_EQ(error_number([&] { (void)a(1, 1); }), kSubscriptOutOfRange);  // wrong rank
+  EXPECT_EQ(error_number([&] { (void)a.lbound(2); }), kSubscriptOutOfRange);
+  EXPECT_EQ(error_number([] { Array<Byte> bad(5, 3); }), kSubscriptOutOfRange);
+
+  Array<Long> negative(-3, -1);
+  negative(-3) = 7;
+  EXPECT_EQ(negative.data()[0], 7);
+}
+
+TEST(Array, TwoDimensionsKeepTheFirstIndexFastest) {
+  Array<Single> t({{1, 2}, {1, 3}});
+  EXPECT_EQ(t.rank(), 2);
+  EXPECT_EQ(t.lbound(2), 1);
+  EXPECT_EQ(t.ubound(2), 3);
+  t(2, 1) = 5.0f;
+  t(1, 3) = 6.0f;
+  EXPECT_EQ(t.data()[1], 5.0f);
+  EXPECT_EQ(t.data()[4], 6.0f);
+  EXPECT_EQ(error_number([&] { (void)t(3, 1); }), kSubscriptOutOfRange);
+  EXPECT_EQ(error_number([&] { (void)t(1, 4); }), kSubscriptOutOfRange);
+  EXPECT_EQ(error_number([&] { (void)t(1); }), kSubscriptOutOfRange);
+}
+
+TEST(Array, RedimDiscardsAndRedimPreserveKeepsWhatStaysInside) {
+  ByteArray a(1, 4);
+  for (Long i = 1; i <= 4; ++i) a(i) = static_cast<Byte>(i);
+
+  a.redim_preserve(1, 6);  // lower bound kept, new elements zero
+  EXPECT_EQ(a.lbound(), 1);
+  EXPECT_EQ(a.ubound(), 6);
+  EXPECT_EQ(a(4), 4);
+  EXPECT_EQ(a(6), 0);
+
+  a.redim_preserve(1, 2);  // cut
+  EXPECT_EQ(a.ubound(), 2);
+  EXPECT_EQ(a(2), 2);
+  a.redim_preserve(1, 3);  // regrown element comes back zero, not the old 3
+  EXPECT_EQ(a(3), 0);
+
+  a.redim_preserve(0, 3);  // lower bound moved: elements keep their indices
+  EXPECT_EQ(a(0), 0);
+  EXPECT_EQ(a(1), 1);
+  EXPECT_EQ(a(2), 2);
+
+  a.redim(0, 1);
+  EXPECT_EQ(a(1), 0);
+
+  ByteArray fresh;  // an array without bounds gets them
+  fresh.redim_preserve(0, 0);
+  EXPECT_EQ(fresh.ubound(), 0);
+
+  a.erase();
+  EXPECT_EQ(a.rank(), 0);
+}
+
+TEST(Array, GrowingOneElementAtATimeReallocatesOnlyLogarithmicallyOften) {
+  ByteArray a(0, -1);
+  int moves = 0;
+  const Byte* last = nullptr;
+  for (Long i = 0; i < 1'000'000; ++i) {
+    a.redim_preserve(0, i);
+    a(i) = static_cast<Byte>(i);
+    if (a.data() != last) {
+      ++moves;
+      last = a.data();
+    }
+  }
+  EXPECT_EQ(a.ubound(), 999'999);  // the bound stays exact
+  EXPECT_LT(moves, 64);
+  EXPECT_EQ(a(999'999), static_cast<Byte>(999'999));
+}
+
+TEST(Array, CopiesAreIndependentValues) {
+  Array<String> a(0, 1);
+  a(0) = u"x";
+  Array<String> b = a;
+  b(0) = u"y";
+  EXPECT_EQ(a(0), u"x");
+  EXPECT_FALSE(a == b);
+}
+
+TEST(FixedArray, CheckedAccessAcceptsEnumerations) {
+  FixedArray<Single, 0, 1> pair;
+  pair(eSC::SCI) = 3.0f;
+  EXPECT_EQ(pair(1), 3.0f);
+  EXPECT_EQ(error_number([&] { (void)pair(2); }), kSubscriptOutOfRange);
+  FixedArray<Long, 1, 40> bands;
+  EXPECT_EQ(bands.size(), 40u);
+  EXPECT_EQ(error_number([&] { (void)bands(0); }), kSubscriptOutOfRange);
+}
+
+}  // namespace
+}  // namespace kvdata

@@ -1,0 +1,66 @@
+#include "kvdata/foundation/records.hpp"
+
+#include <gtest/gtest.h>
+
+namespace kvdata {
+namespace {
+
+template <class F>
+Long error_number(F&& f) {
+  try {
+    f();
+  } catch (const Error& e) {
+    return e.number();
+  }
+  return 0;
+}
+
+TEST(Records, AssignmentCopiesArraysAndNestedRecords) {
+  tTileSet source;
+  source.TSN = u"TS-1";
+  source.Tiles.redim(1, 13);
+  source.Tiles(5).Name = u"Red";
+  tTileSet copy = source;
+  copy.Tiles(5).Name = u"Blue";
+  copy.Tiles(5).TempComp.Data(40) = 1.0f;
+  EXPECT_EQ(source.Tiles(5).Name, u"Red");
+  EXPECT_EQ(source.Tiles(5).TempComp.Data(40), 0.0f);
+
+  tOVProfile profile;
+  profile.ProfileData = tOVProfileDataV1{};
+  tOVProfile profile_copy = profile;
+  profile_copy.ProfileData.get<tOVProfileDataV1>().Dark(eSC::SCI).Data(1) = 2.0f;
+  EXPECT_EQ(profile.ProfileData.get<tOVProfileDataV1>().Dark(eSC::SCI).Data(1), 0.0f);
+  EXPECT_EQ(profile.ProfileData.type(), VarType::UserDefinedType);
+}
+
+TEST(Records, FreshRecordsAreEmptyAndFixedArraysKeepTheirIndexRanges) {
+  tTileSet set;
+  EXPECT_EQ(error_number([&] { (void)set.Tiles.ubound(); }), kSubscriptOutOfRange);
+  tTestRun1 run;
+  EXPECT_TRUE(run.ISN.empty());
+  EXPECT_EQ(run.TestDate, Date{0.0});
+  EXPECT_FALSE(run.IIA.Has2Measurement);
+  EXPECT_EQ(run.IIA.Measurements(1).Tiles.rank(), 0);
+  EXPECT_TRUE(tOVProfile{}.ProfileData.is_empty());
+
+  tSpectrum spectrum;
+  tSCPair pair;
+  tDeltas deltas;
+  EXPECT_EQ(error_number([&] { (void)spectrum.Data(0); }), kSubscriptOutOfRange);
+  EXPECT_EQ(error_number([&] { (void)pair.Spectrum(2); }), kSubscriptOutOfRange);
+  EXPECT_EQ(error_number([&] { (void)deltas.dE(2); }), kSubscriptOutOfRange);
+  EXPECT_EQ(error_number([&] { (void)run.IIA.Measurements(0); }), kSubscriptOutOfRange);
+  EXPECT_EQ(error_number([&] { (void)run.LightLevels.LightLevels(9); }), kSubscriptOutOfRange);
+}
+
+TEST(Records, EnumerationsHoldTheirTypeLibraryValues) {
+  EXPECT_EQ(static_cast<Long>(eAccessTypes::accessRead), 1);
+  EXPECT_EQ(static_cast<Long>(eTestResult::NA), 3);
+  EXPECT_EQ(static_cast<Long>(eAperture::VerySmall), 3);
+  EXPECT_EQ(static_cast<Long>(eDBProviders::ODBC), 3);
+  EXPECT_EQ(static_cast<Long>(eStreamDirection::FromStream), 1);
+}
+
+}  // namespace
+}  // namespace kvdata
