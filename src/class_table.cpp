@@ -1,6 +1,7 @@
 // The table of creatable classes, one line per class, in the order in which
 // the library lists them. Interface classes and facades are not creatable.
 #include "kvdata/automation/create_object.hpp"
+#include "kvdata/objects/kv_profile.hpp"
 #include "kvdata/streams/streams.hpp"
 
 namespace kvdata {
@@ -13,6 +14,7 @@ std::shared_ptr<Object> make() {
 
 // Filled as the classes are added: {u"KVData.KVUser", &make<KVUser>}, ...
 constexpr CreatableClass kClasses[] = {
+    {u"KVData.KVProfile", &make<KVProfile>},
     {u"KVData.Streams", &make<Streams>},
 };
 

@@ -7,4 +7,5 @@
 
 #include "kvdata/automation.hpp"
 #include "kvdata/foundation.hpp"
+#include "kvdata/objects.hpp"
 #include "kvdata/streams.hpp"
