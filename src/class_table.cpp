@@ -2,6 +2,8 @@
 // the library lists them. Interface classes and facades are not creatable.
 #include "kvdata/automation/create_object.hpp"
 #include "kvdata/objects/kv_profile.hpp"
+#include "kvdata/objects/kv_test_run.hpp"
+#include "kvdata/objects/kv_test_run_tiles_de.hpp"
 #include "kvdata/streams/streams.hpp"
 
 namespace kvdata {
@@ -14,7 +16,9 @@ std::shared_ptr<Object> make() {
 
 // Filled as the classes are added: {u"KVData.KVUser", &make<KVUser>}, ...
 constexpr CreatableClass kClasses[] = {
+    {u"KVData.KVTestRunTilesDE", &make<KVTestRunTilesDE>},
     {u"KVData.KVProfile", &make<KVProfile>},
+    {u"KVData.KVTestRun", &make<KVTestRun>},
     {u"KVData.Streams", &make<Streams>},
 };
 

@@ -2,3 +2,5 @@
 // The domain objects of the library.
 
 #include "kvdata/objects/kv_profile.hpp"
+#include "kvdata/objects/kv_test_run.hpp"
+#include "kvdata/objects/kv_test_run_tiles_de.hpp"
