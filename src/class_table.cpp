@@ -4,6 +4,9 @@
 #include "kvdata/objects/kv_profile.hpp"
 #include "kvdata/objects/kv_test_run.hpp"
 #include "kvdata/objects/kv_test_run_tiles_de.hpp"
+#include "kvdata/objects/kv_tol_set.hpp"
+#include "kvdata/objects/kv_tolerance.hpp"
+#include "kvdata/objects/kv_user.hpp"
 #include "kvdata/streams/streams.hpp"
 
 namespace kvdata {
@@ -14,8 +17,10 @@ std::shared_ptr<Object> make() {
   return T::create();
 }
 
-// Filled as the classes are added: {u"KVData.KVUser", &make<KVUser>}, ...
 constexpr CreatableClass kClasses[] = {
+    {u"KVData.KVUser", &make<KVUser>},
+    {u"KVData.KVTolerance", &make<KVTolerance>},
+    {u"KVData.KVTolSet", &make<KVTolSet>},
     {u"KVData.KVTestRunTilesDE", &make<KVTestRunTilesDE>},
     {u"KVData.KVProfile", &make<KVProfile>},
     {u"KVData.KVTestRun", &make<KVTestRun>},
@@ -24,8 +29,6 @@ constexpr CreatableClass kClasses[] = {
 
 }  // namespace
 
-std::span<const CreatableClass> CreatableClasses() {
-  return std::span<const CreatableClass>(kClasses);
-}
+std::span<const CreatableClass> CreatableClasses() { return kClasses; }
 
 }  // namespace kvdata

@@ -39,12 +39,17 @@ std::string native_name(const String& filename) {
   return to_utf8(filename);
 }
 
-// Creates a new, exclusively owned file beside `target` and opens it for
-// binary writing; its name is returned in `name`. Null when none could be made.
+// Creates a new, exclusively owned file in the directory of `target` (so
+// that renaming it over the target stays within one file system) and opens
+// it for binary writing; its name is returned in `name`. The name is short,
+// so a target whose own name is near the length limit still gets one. Null
+// when none could be made.
 File create_beside(const std::string& target, std::string& name) {
+  const std::filesystem::path directory = std::filesystem::path(target).parent_path();
   std::random_device entropy;
   for (int attempt = 0; attempt < 16; ++attempt) {
-    name = target + ".~" + std::to_string(entropy()) + ".tmp";
+    const std::string leaf = ".kvdata~" + std::to_string(entropy()) + ".tmp";
+    name = (directory / leaf).string();
     if (std::FILE* file = std::fopen(name.c_str(), "wbx")) return File(file);
     if (errno != EEXIST) break;
   }

@@ -1,0 +1,310 @@
+#include "kvdata/objects/kv_tol_set.hpp"
+
+#include <gtest/gtest.h>
+
+#include <limits>
+#include <vector>
+
+#include "kvdata/automation/create_object.hpp"
+#include "kvdata/automation/error.hpp"
+#include "objects/expected_bytes.hpp"
+
+namespace {
+
+using kvdata::ByteArray;
+using kvdata::Date;
+using kvdata::Double;
+using kvdata::IKVDBObject;
+using kvdata::IKVObj;
+using kvdata::IKVSecurity;
+using kvdata::IKVStream;
+using kvdata::IKVTolerance;
+using kvdata::IKVTolSet;
+using kvdata::KVTolerance;
+using kvdata::KVTolSet;
+using kvdata::Long;
+using kvdata::String;
+using kvdata::Variant;
+
+std::shared_ptr<KVTolerance> tolerance(Long id, const String& name = {}) {
+  auto tol = KVTolerance::create();
+  tol->ID(id);
+  if (!name.empty()) tol->TolName(name);
+  return tol;
+}
+
+// The IDs of the members in enumeration order.
+std::vector<Long> member_ids(const KVTolSet& set) {
+  std::vector<Long> ids;
+  for (const auto& member : set) ids.push_back(member->ID());
+  return ids;
+}
+
+// The 749-byte image of a tolerance that has only its ID and TolName set:
+// the other texts were never stored and stay zero.
+std::vector<kvdata::Byte> member_image(std::initializer_list<int> id, std::string_view name) {
+  ExpectedBytes e;
+  e.bytes(id).text(name, 50).zeros(510 + 2 + 32 + 100 + 1);
+  return e.all;
+}
+
+// A set with header ID 7, InstTypeID 3, CreateDate 2.0 and description
+// "Set", holding tolerances 5 ("A") and 9 ("B") under their IDs.
+std::shared_ptr<KVTolSet> two_member_set() {
+  auto set = KVTolSet::create();
+  IKVTolSet& s = *set;
+  s.ID(7);
+  s.InstTypeID(3);
+  s.CreateDate(Date{2.0});
+  s.Description(Variant(u"Set"));
+  s.Add(tolerance(5, u"A"), u"5");
+  s.Add(tolerance(9, u"B"), u"9");
+  return set;
+}
+
+TEST(KVTolSet, StreamIsTheHeaderThenEachMember) {
+  ExpectedBytes e;
+  e.bytes({0x07, 0x00, 0x00, 0x00})                             // ID
+      .bytes({0x03, 0x00, 0x00, 0x00})                          // InstTypeID
+      .bytes({0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0x40})  // CreateDate 2.0
+      .text("Set", 255)                                         // Description
+      .bytes({0x00, 0x00})                                      // gap
+      .bytes({0x02, 0x00, 0x00, 0x00})                          // member count
+      .bytes({0x00})                                            // trailing byte
+      .append(member_image({0x05, 0x00, 0x00, 0x00}, "A"))
+      .append(member_image({0x09, 0x00, 0x00, 0x00}, "B"));
+  ASSERT_EQ(e.all.size(), 2031u);
+
+  auto set = two_member_set();
+  ByteArray bytes(0, -1);
+  Long pos = 0;
+  ASSERT_TRUE(set->StreamOut(bytes, pos));
+  EXPECT_EQ(pos, 2031);
+  EXPECT_EQ(bytes.lbound(), 0);
+  EXPECT_EQ(bytes.ubound(), 2031);
+  EXPECT_TRUE(HoldsAt(bytes, 0, e.all));
+  EXPECT_EQ(set->StreamLen(), 532 + 2 * 748);
+
+  // Keys come back from the members' IDs, in stream order.
+  auto back = KVTolSet::create();
+  pos = 0;
+  ASSERT_TRUE(back->StreamIn(bytes, pos));
+  EXPECT_EQ(pos, 2031);
+  IKVTolSet& b = *back;
+  EXPECT_EQ(b.count(), 2);
+  EXPECT_EQ(member_ids(*back), (std::vector<Long>{5, 9}));
+  EXPECT_EQ(b.Item(Variant(u"9"))->TolName(), u"B");
+  EXPECT_EQ(b.ID(), 7);
+  EXPECT_EQ(b.InstTypeID(), 3);
+  EXPECT_EQ(b.CreateDate(), Date{2.0});
+  EXPECT_EQ(b.Description(), Variant(u"Set"));
+
+  // An empty set: the header alone, one spare element after it.
+  auto empty = KVTolSet::create();
+  ByteArray alone;
+  pos = 0;
+  ASSERT_TRUE(empty->StreamOut(alone, pos));
+  EXPECT_EQ(pos, 533);
+  EXPECT_EQ(alone.ubound(), 533);
+  EXPECT_TRUE(HoldsAt(alone, 528, {0x00, 0x00, 0x00, 0x00, 0x00, 0x00}));
+  EXPECT_EQ(empty->StreamLen(), 532);
+}
+
+TEST(KVTolSet, StreamOutSetsTheArrayToItsOwnEnd) {
+  // A longer array is cut to the final Position; what precedes the set stays.
+  ByteArray longer(0, 4999);
+  for (auto& b : longer) b = 0xEE;
+  Long pos = 3;
+  ASSERT_TRUE(two_member_set()->StreamOut(longer, pos));
+  EXPECT_EQ(pos, 2034);
+  EXPECT_EQ(longer.ubound(), 2034);
+  EXPECT_TRUE(HoldsAt(longer, 0, {0xEE, 0xEE, 0xEE, 0x07}));
+
+  // A Position below 0 fails before the array is touched.
+  ByteArray kept(0, 9);
+  pos = -1;
+  EXPECT_FALSE(two_member_set()->StreamOut(kept, pos));
+  EXPECT_EQ(pos, -1);
+  EXPECT_EQ(kept.ubound(), 9);
+
+  // A Position whose header would pass the Long range fails the same way.
+  pos = std::numeric_limits<Long>::max() - 100;
+  EXPECT_FALSE(two_member_set()->StreamOut(kept, pos));
+  EXPECT_EQ(kept.ubound(), 9);
+
+  // An array never given bounds counts as empty.
+  ByteArray unbounded;
+  EXPECT_TRUE(two_member_set()->StreamOut(unbounded));
+  EXPECT_EQ(unbounded.ubound(), 2031);
+}
+
+TEST(KVTolSet, StreamInStopsAtTheFirstBadMember) {
+  ByteArray bytes;
+  ASSERT_TRUE(two_member_set()->StreamOut(bytes));
+
+  // A repeated ID: the first member stays, the second is refused.
+  ByteArray same_ids = bytes;
+  same_ids(533 + 749) = 0x05;
+  auto set = KVTolSet::create();
+  Long pos = 0;
+  EXPECT_FALSE(set->StreamIn(same_ids, pos));
+  EXPECT_EQ(pos, 2031);
+  EXPECT_EQ(member_ids(*set), (std::vector<Long>{5}));
+  EXPECT_EQ(set->InstTypeID(), 3);  // the header as read
+
+  // A count larger than the stream holds stops when the bytes run out.
+  ByteArray huge = bytes;
+  huge(528) = 0xFF;
+  huge(529) = 0xFF;
+  huge(530) = 0xFF;
+  huge(531) = 0x7F;
+  pos = 0;
+  EXPECT_FALSE(set->StreamIn(huge, pos));
+  EXPECT_EQ(member_ids(*set), (std::vector<Long>{5, 9}));
+  EXPECT_EQ(pos, 2032);  // past the spare element, the last one there was
+
+  // A count of 0 or less: no members, True after the header.
+  for (int count_high_byte : {0x00, 0x80}) {
+    ByteArray none = bytes;
+    none(528) = 0x00;
+    none(531) = static_cast<kvdata::Byte>(count_high_byte);
+    pos = 0;
+    EXPECT_TRUE(set->StreamIn(none, pos));
+    EXPECT_EQ(pos, 533);
+    EXPECT_EQ(set->count(), 0);
+  }
+
+  // A short header: False, members removed, header unchanged.
+  auto kept = two_member_set();
+  ByteArray short_header(0, 99);
+  pos = 0;
+  EXPECT_FALSE(kept->StreamIn(short_header, pos));
+  EXPECT_EQ(pos, 100);
+  EXPECT_EQ(kept->count(), 0);
+  EXPECT_EQ(kept->InstTypeID(), 3);
+}
+
+TEST(KVTolSet, ItemLooksUpTextKeysNeverPositions) {
+  auto set = two_member_set();
+  IKVTolSet& s = *set;
+  const auto five = s.Item(Variant(u"5"));
+  EXPECT_EQ(five->ID(), 5);
+  EXPECT_EQ(s.Item(Variant(Long{5})), five);
+  EXPECT_EQ(s.Item(Variant(Double{5.0})), five);
+
+  // The number 1 is the key "1", which is not held.
+  const auto missing = s.Item(Variant(Long{1}));
+  EXPECT_NE(missing, nullptr);
+  EXPECT_EQ(missing->ID(), 0);
+  EXPECT_EQ(missing->TolName(), u"MISSING");
+  EXPECT_EQ(missing->Description(), u"Missing Tolerance 1");
+
+  // One placeholder, shared: a limit set on it is there at the next miss,
+  // which renames it for its own key.
+  missing->MaxFail(4.5);
+  missing->ID(12);
+  const auto again = s.Item(Variant(u"x7"));
+  EXPECT_EQ(again, missing);
+  EXPECT_EQ(again->MaxFail(), 4.5);
+  EXPECT_EQ(again->ID(), 0);
+  EXPECT_EQ(again->Description(), u"Missing Tolerance x7");
+
+  // An argument without a text form misses with an empty key
+  // (the getter trims the trailing blank of "Missing Tolerance ").
+  EXPECT_EQ(s.Item(Variant(set))->Description(), u"Missing Tolerance");
+  EXPECT_EQ(s.Item(Variant(kvdata::Null{}))->TolName(), u"MISSING");
+
+  // Keys are compared without regard to case.
+  s.Add(tolerance(20), u"dE");
+  EXPECT_EQ(s.Item(Variant(u"DE"))->ID(), 20);
+}
+
+TEST(KVTolSet, AddAndRemoveRaiseToTheCaller) {
+  auto set = two_member_set();
+  IKVTolSet& s = *set;
+  auto expect_error = [](Long number, auto&& call) {
+    try {
+      call();
+      ADD_FAILURE() << "no error raised";
+    } catch (const kvdata::Error& e) {
+      EXPECT_EQ(e.number(), number);
+    }
+  };
+  s.Add(tolerance(30), u"ab");
+  expect_error(kvdata::kDuplicateKey, [&] { s.Add(tolerance(31), u"AB"); });
+  expect_error(kvdata::kObjectNotSet, [&] { s.Add(nullptr, u"n"); });
+  expect_error(kvdata::kInvalidProcedureCall, [&] { s.Remove(Variant(u"nope")); });
+  expect_error(kvdata::kInvalidProcedureCall, [&] { s.Remove(Variant(u"")); });
+  EXPECT_EQ(s.count(), 3);
+  EXPECT_EQ(member_ids(*set), (std::vector<Long>{5, 9, 30}));
+
+  // Removing from the middle keeps the later keys reachable.
+  s.Remove(Variant(Long{9}));
+  EXPECT_EQ(member_ids(*set), (std::vector<Long>{5, 30}));
+  EXPECT_EQ(s.Item(Variant(u"AB"))->ID(), 30);
+  s.Add(tolerance(9), u"9");
+  EXPECT_EQ(s.Item(Variant(u"9"))->ID(), 9);
+
+  // A member without a key is counted, enumerated and streamed, but only
+  // reachable by key after a write and a read.
+  s.Add(tolerance(44));
+  EXPECT_EQ(s.count(), 4);
+  EXPECT_EQ(s.Item(Variant(u"44"))->TolName(), u"MISSING");
+  ByteArray bytes;
+  ASSERT_TRUE(set->StreamOut(bytes));
+  auto back = KVTolSet::create();
+  ASSERT_TRUE(back->StreamIn(bytes));
+  EXPECT_EQ(member_ids(*back), (std::vector<Long>{5, 30, 9, 44}));
+  EXPECT_EQ(back->Item(Variant(u"44"))->ID(), 44);
+  EXPECT_EQ(back->Item(Variant(u"ab"))->TolName(), u"MISSING");  // keys are the IDs now
+
+  // The enumerator is a snapshot of the members in order.
+  const auto members = s.NewEnum();
+  s.Remove(Variant(u"5"));
+  ASSERT_EQ(members->Count(), 4);
+  EXPECT_EQ(
+      kvdata::query<IKVTolerance>(members->Item(Variant(Long{1})).get<Variant::ObjectRef>())->ID(),
+      5);
+}
+
+TEST(KVTolSet, IdentityAndInertInterfaces) {
+  auto object = kvdata::CreateObject(u"KVData.KVTolSet");
+  const auto set = kvdata::query<IKVTolSet>(object);
+  ASSERT_NE(set, nullptr);
+  set->ID(7);
+  set->InstTypeID(3);
+  set->CreateDate(Date{45000.25});
+
+  const auto obj = kvdata::query<IKVObj>(object);
+  EXPECT_EQ(obj->ObjType(), u"TolSet");
+  EXPECT_EQ(obj->Description(), u"Tolerance Set");
+  EXPECT_EQ(obj->ID(), Variant(Long{3}));  // the InstTypeID, not the ID
+  EXPECT_EQ(obj->DateCreated(), Variant(Date{45000.25}));
+  set->InstTypeID(4);
+  EXPECT_EQ(obj->ID(), Variant(Long{4}));
+
+  // Description takes any value that has a text form.
+  set->Description(Variant(Long{12}));
+  EXPECT_EQ(set->Description(), Variant(u"12"));
+  set->set_Description(Variant(u"  Spectro  "));
+  EXPECT_EQ(set->Description(), Variant(u"Spectro"));
+
+  const auto db = kvdata::query<IKVDBObject>(object);
+  String id = u"X";
+  const Variant when = Date{1.0};
+  EXPECT_FALSE(db->Retrieve(id, &when));
+  EXPECT_EQ(id, u"X");
+  EXPECT_FALSE(db->AddNew() || db->Update() || db->Delete());
+  EXPECT_EQ(db->ErrMsg(), u"");
+
+  const auto security = kvdata::query<IKVSecurity>(object);
+  EXPECT_EQ(security->UserNumber(), 0);
+  security->UserNumber(42);
+  EXPECT_EQ(security->UserNumber(), 42);
+  EXPECT_FALSE(security->CanRead() || security->CanAdd() || security->CanUpdate() ||
+               security->CanDelete());
+
+  EXPECT_NE(kvdata::query<IKVTolerance>(kvdata::CreateObject(u"KVData.KVTolerance")), nullptr);
+}
+
+}  // namespace

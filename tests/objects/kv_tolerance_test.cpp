@@ -1,0 +1,213 @@
+#include "kvdata/objects/kv_tolerance.hpp"
+
+#include <gtest/gtest.h>
+
+#include <limits>
+
+#include "kvdata/automation/error.hpp"
+#include "objects/expected_bytes.hpp"
+
+namespace {
+
+using kvdata::ByteArray;
+using kvdata::IKVStream;
+using kvdata::IKVTolerance;
+using kvdata::KVTolerance;
+using kvdata::Long;
+using kvdata::String;
+
+std::shared_ptr<KVTolerance> sample_tolerance() {
+  auto tol = KVTolerance::create();
+  tol->ID(5);
+  tol->TolName(u"dE");
+  tol->Description(u"Max");
+  tol->MinFail(-1.5);
+  tol->MinWarn(0.5);
+  tol->MaxWarn(1.0);
+  tol->MaxFail(2.0);
+  tol->Misc(u"");
+  return tol;
+}
+
+// The 749 bytes of sample_tolerance(), from the record layout.
+std::vector<kvdata::Byte> sample_image() {
+  ExpectedBytes e;
+  e.bytes({0x05, 0x00, 0x00, 0x00})                             // ID
+      .text("dE", 50)                                           // TolName
+      .text("Max", 255)                                         // Description
+      .bytes({0x00, 0x00})                                      // gap
+      .bytes({0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0xF8, 0xBF})  // MinFail -1.5
+      .bytes({0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0xE0, 0x3F})  // MinWarn 0.5
+      .bytes({0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0xF0, 0x3F})  // MaxWarn 1.0
+      .bytes({0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0x40})  // MaxFail 2.0
+      .text("", 50)                                             // Misc
+      .bytes({0x00});                                           // trailing byte
+  return e.all;
+}
+
+TEST(KVTolerance, StreamImageIsTheRecordAndOneTrailingByte) {
+  const auto expected = sample_image();
+  ASSERT_EQ(expected.size(), 749u);
+
+  ByteArray bytes(0, -1);
+  Long pos = 0;
+  ASSERT_TRUE(sample_tolerance()->StreamOut(bytes, pos));
+  EXPECT_EQ(pos, 749);
+  EXPECT_EQ(bytes.lbound(), 0);
+  EXPECT_EQ(bytes.ubound(), 749);  // one element beyond the image
+  EXPECT_TRUE(HoldsAt(bytes, 0, expected));
+  EXPECT_EQ(bytes(749), 0);
+
+  auto back = KVTolerance::create();
+  pos = 0;
+  ASSERT_TRUE(back->StreamIn(bytes, pos));
+  EXPECT_EQ(pos, 749);
+  EXPECT_EQ(back->ID(), 5);
+  EXPECT_EQ(back->TolName(), u"dE");
+  EXPECT_EQ(back->Description(), u"Max");
+  EXPECT_EQ(back->MinFail(), -1.5);
+  EXPECT_EQ(back->MinWarn(), 0.5);
+  EXPECT_EQ(back->MaxWarn(), 1.0);
+  EXPECT_EQ(back->MaxFail(), 2.0);
+  EXPECT_EQ(back->Misc(), u"");
+
+  // A new tolerance streams a zero-filled record: its texts were never set.
+  ByteArray fresh;
+  ASSERT_TRUE(KVTolerance::create()->StreamOut(fresh));
+  EXPECT_TRUE(HoldsAt(fresh, 0, std::vector<kvdata::Byte>(750, 0)));
+}
+
+TEST(KVTolerance, StreamOutOnlyGrowsAShortArray) {
+  // A longer array keeps its length and the bytes around the tolerance.
+  ByteArray longer(0, 999);
+  for (auto& b : longer) b = 0xEE;
+  Long pos = 10;
+  ASSERT_TRUE(sample_tolerance()->StreamOut(longer, pos));
+  EXPECT_EQ(pos, 759);
+  EXPECT_EQ(longer.ubound(), 999);
+  EXPECT_TRUE(HoldsAt(longer, 0, std::vector<kvdata::Byte>(10, 0xEE)));
+  EXPECT_TRUE(HoldsAt(longer, 10, sample_image()));
+  EXPECT_TRUE(HoldsAt(longer, 759, std::vector<kvdata::Byte>(241, 0xEE)));
+
+  // An array that ends exactly at Position + 749 is not grown.
+  ByteArray exact(0, 749);
+  pos = 0;
+  ASSERT_TRUE(sample_tolerance()->StreamOut(exact, pos));
+  EXPECT_EQ(exact.ubound(), 749);
+
+  // A shorter array grows to run from 0, keeping what it held at its indices.
+  ByteArray from_file(1, 3);
+  from_file(1) = 0x11;
+  from_file(2) = 0x22;
+  from_file(3) = 0x33;
+  pos = 3;
+  ASSERT_TRUE(sample_tolerance()->StreamOut(from_file, pos));
+  EXPECT_EQ(from_file.lbound(), 0);
+  EXPECT_EQ(from_file.ubound(), 752);
+  EXPECT_TRUE(HoldsAt(from_file, 0, {0x00, 0x11, 0x22}));
+  EXPECT_TRUE(HoldsAt(from_file, 3, sample_image()));
+
+  // An array that was never given bounds counts as empty.
+  ByteArray unbounded;
+  pos = 0;
+  ASSERT_TRUE(sample_tolerance()->StreamOut(unbounded, pos));
+  EXPECT_EQ(unbounded.lbound(), 0);
+  EXPECT_EQ(unbounded.ubound(), 749);
+}
+
+TEST(KVTolerance, StreamOutRaisesTheFailureWithItsStep) {
+  ByteArray bytes(0, -1);
+  Long pos = -1;
+  try {
+    sample_tolerance()->StreamOut(bytes, pos);
+    ADD_FAILURE() << "no error raised";
+  } catch (const kvdata::Error& e) {
+    EXPECT_EQ(e.number(), kvdata::kSubscriptOutOfRange);
+    EXPECT_EQ(e.source(), u"KVData");
+    EXPECT_EQ(e.description(),
+              u"Error copying tolerance to stream while streaming out tolerance: "
+              u"Subscript out of range");
+  }
+  EXPECT_EQ(pos, -1);
+  EXPECT_EQ(bytes.ubound(), 748);  // grown before the copy failed
+
+  ByteArray untouched(0, 9);
+  pos = std::numeric_limits<Long>::max() - 100;
+  try {
+    sample_tolerance()->StreamOut(untouched, pos);
+    ADD_FAILURE() << "no error raised";
+  } catch (const kvdata::Error& e) {
+    EXPECT_EQ(e.number(), kvdata::kOverflow);
+    EXPECT_EQ(e.description(),
+              u"Error reallocating stream while streaming out tolerance: Overflow");
+  }
+  EXPECT_EQ(pos, std::numeric_limits<Long>::max() - 100);
+  EXPECT_EQ(untouched.ubound(), 9);
+}
+
+TEST(KVTolerance, StreamInNeedsAll749Bytes) {
+  ByteArray full;
+  ASSERT_TRUE(sample_tolerance()->StreamOut(full));
+
+  ByteArray exact(0, 748);  // 749 bytes: the encoding and nothing more
+  for (Long i = 0; i <= 748; ++i) exact(i) = full(i);
+  auto tol = KVTolerance::create();
+  Long pos = 0;
+  EXPECT_TRUE(tol->StreamIn(exact, pos));
+  EXPECT_EQ(pos, 749);
+  EXPECT_EQ(tol->MaxFail(), 2.0);
+
+  // One byte short: False, the record unchanged, Position past the bytes read.
+  ByteArray shorter(0, 747);
+  for (Long i = 0; i <= 747; ++i) shorter(i) = full(i);
+  auto other = KVTolerance::create();
+  other->ID(77);
+  pos = 0;
+  EXPECT_FALSE(other->StreamIn(shorter, pos));
+  EXPECT_EQ(pos, 748);
+  EXPECT_EQ(other->ID(), 77);
+  EXPECT_EQ(other->MaxFail(), 0.0);
+
+  // A Position before the array's first index reads nothing.
+  ByteArray from_file(1, 749);
+  pos = 0;
+  EXPECT_FALSE(other->StreamIn(from_file, pos));
+  EXPECT_EQ(pos, 0);
+  pos = -5;
+  EXPECT_FALSE(other->StreamIn(exact, pos));
+  EXPECT_EQ(pos, -5);
+
+  // No array, or a Position whose block would pass the Long range.
+  pos = 0;
+  EXPECT_FALSE(other->StreamIn(ByteArray(), pos));
+  EXPECT_EQ(pos, 0);
+  pos = std::numeric_limits<Long>::max() - 10;
+  EXPECT_FALSE(other->StreamIn(exact, pos));
+  EXPECT_EQ(pos, std::numeric_limits<Long>::max() - 10);
+  EXPECT_EQ(other->ID(), 77);
+}
+
+TEST(KVTolerance, TextFieldsAreCutPaddedAndTrimmed) {
+  auto tol = KVTolerance::create();
+  IKVTolerance& t = *tol;
+  const String sixty(60, u'x');
+  t.TolName(sixty);
+  EXPECT_EQ(t.TolName(), sixty.substr(0, 50));
+  t.TolName(u"  Red  ");
+  EXPECT_EQ(t.TolName(), u"Red");
+  t.Description(String(300, u'd'));
+  t.Misc(String(51, u'm'));
+  EXPECT_EQ(t.Misc(), String(50, u'm'));
+  // A text cut to its width does not run into the next field.
+  EXPECT_EQ(t.Description(), String(255, u'd'));
+  EXPECT_EQ(t.TolName(), u"Red");
+
+  // Limits are stored as given, in any order.
+  t.MinFail(9.0);
+  t.MaxFail(-9.0);
+  EXPECT_EQ(t.MinFail(), 9.0);
+  EXPECT_EQ(t.MaxFail(), -9.0);
+  EXPECT_EQ(kvdata::query<IKVStream>(tol)->StreamLen(), 748);
+}
+
+}  // namespace

@@ -1,0 +1,223 @@
+#include "kvdata/objects/kv_user.hpp"
+
+#include <gtest/gtest.h>
+
+#include <limits>
+#include <vector>
+
+#include "kvdata/automation/create_object.hpp"
+#include "kvdata/automation/event_log.hpp"
+#include "kvdata/foundation/ikv_db_object.hpp"
+#include "kvdata/foundation/ikv_security.hpp"
+#include "objects/expected_bytes.hpp"
+
+namespace {
+
+using kvdata::ByteArray;
+using kvdata::KVUser;
+using kvdata::Long;
+using kvdata::String;
+using kvdata::tUser;
+
+tUser sample_user() {
+  tUser u;
+  u.USERID = u"ABCD";
+  u.UserNumber = 0x01020304;
+  u.LastName = String(60, u'L');
+  u.FirstName = u"Ann  ";
+  u.UserPWD = u"pw";
+  u.UserMail = u"a@b.c";
+  u.OrgID = -2;
+  return u;  // RoleCode and Disabled empty
+}
+
+// The 848 bytes of sample_user(), from the user layout.
+std::vector<kvdata::Byte> sample_image() {
+  ExpectedBytes e;
+  e.bytes({0x9A, 0x99, 0x99, 0x3F})     // stamp 1.2
+      .text("ABCD", 30)                 // USERID
+      .bytes({0x04, 0x03, 0x02, 0x01})  // UserNumber
+      .text(std::string(50, 'L'), 50)   // LastName, cut
+      .text("Ann", 50)                  // FirstName
+      .text("pw", 30)                   // UserPWD
+      .text("a@b.c", 255)               // UserMail
+      .bytes({0x00, 0x00})              // gap
+      .bytes({0xFE, 0xFF, 0xFF, 0xFF})  // OrgID -2
+      .bytes({0x20, 0x00})              // RoleCode
+      .bytes({0x20, 0x00});             // Disabled
+  return e.all;
+}
+
+std::shared_ptr<KVUser> sample() {
+  auto user = KVUser::create();
+  user->v1User(sample_user());
+  return user;
+}
+
+// Collects event-log entries for the life of the object.
+class LogCapture {
+ public:
+  LogCapture()
+      : previous_(kvdata::EventLog::SetSink([this](const String& t) { entries.push_back(t); })) {}
+  ~LogCapture() { kvdata::EventLog::SetSink(previous_); }
+  std::vector<String> entries;
+
+ private:
+  kvdata::EventLog::Sink previous_;
+};
+
+TEST(KVUser, StreamIsTheStampAndTheBlockWithOneSpareByte) {
+  const auto expected = sample_image();
+  ASSERT_EQ(expected.size(), 848u);
+
+  ByteArray bytes(0, -1);
+  Long pos = 0;
+  ASSERT_TRUE(sample()->StreamOut(bytes, pos));
+  EXPECT_EQ(pos, 848);
+  EXPECT_EQ(bytes.lbound(), 0);
+  EXPECT_EQ(bytes.ubound(), 848);
+  EXPECT_TRUE(HoldsAt(bytes, 0, expected));
+  EXPECT_EQ(bytes(848), 0);
+
+  auto back = KVUser::create();
+  pos = 0;
+  ASSERT_TRUE(back->StreamIn(bytes, pos));
+  EXPECT_EQ(pos, 848);
+  const tUser u = back->v1User();
+  EXPECT_EQ(u.USERID, u"ABCD");
+  EXPECT_EQ(u.UserNumber, 0x01020304);
+  EXPECT_EQ(u.LastName, String(50, u'L'));
+  EXPECT_EQ(u.FirstName, u"Ann");
+  EXPECT_EQ(u.UserPWD, u"pw");
+  EXPECT_EQ(u.UserMail, u"a@b.c");
+  EXPECT_EQ(u.OrgID, -2);
+  EXPECT_EQ(u.RoleCode, u"");
+  EXPECT_EQ(u.Disabled, u" ");  // its one unit, blank kept
+  EXPECT_EQ(back->ErrMsg(), u"");
+
+  // A 31-character USERID comes back as its first 30; leading blanks go.
+  tUser long_id;
+  long_id.USERID = String(30, u'u') + u"v";
+  long_id.RoleCode = u" A";
+  long_id.Disabled = u"YN";
+  auto writer = KVUser::create();
+  writer->v1User(long_id);
+  ASSERT_TRUE(writer->StreamOut(bytes));
+  ASSERT_TRUE(back->StreamIn(bytes));
+  EXPECT_EQ(back->v1User().USERID, String(30, u'u'));
+  EXPECT_EQ(back->v1User().RoleCode, u"");  // its one unit was the blank
+  EXPECT_EQ(back->v1User().Disabled, u"Y");
+}
+
+TEST(KVUser, StreamOutSetsTheArrayToEndOneBeyondTheEncoding) {
+  ByteArray bytes(0, 4);
+  for (auto& b : bytes) b = 0xAB;
+  Long pos = 10;
+  ASSERT_TRUE(sample()->StreamOut(bytes, pos));
+  EXPECT_EQ(pos, 858);
+  EXPECT_EQ(bytes.ubound(), 858);
+  EXPECT_TRUE(HoldsAt(bytes, 0, {0xAB, 0xAB, 0xAB, 0xAB, 0xAB, 0, 0, 0, 0, 0}));
+  EXPECT_TRUE(HoldsAt(bytes, 10, sample_image()));
+
+  // A longer array is cut; an array never given bounds is created.
+  ByteArray longer(0, 2000);
+  ASSERT_TRUE(sample()->StreamOut(longer));
+  EXPECT_EQ(longer.ubound(), 848);
+  ByteArray unbounded;
+  ASSERT_TRUE(sample()->StreamOut(unbounded));
+  EXPECT_EQ(unbounded.ubound(), 848);
+
+  // A Position below 0 changes nothing and leaves its text.
+  auto user = sample();
+  ByteArray kept(0, 9);
+  pos = -1;
+  EXPECT_FALSE(user->StreamOut(kept, pos));
+  EXPECT_EQ(pos, -1);
+  EXPECT_EQ(kept.ubound(), 9);
+  EXPECT_EQ(user->ErrMsg(), u"Position value was not initialized properly");
+  // A later success does not clear it.
+  EXPECT_TRUE(user->StreamIn(longer));
+  EXPECT_EQ(user->ErrMsg(), u"Position value was not initialized properly");
+
+  // An encoding that would end past the Long range is refused the same way.
+  pos = std::numeric_limits<Long>::max() - 847;
+  EXPECT_FALSE(user->StreamOut(kept, pos));
+  EXPECT_EQ(pos, std::numeric_limits<Long>::max() - 847);
+  EXPECT_EQ(kept.ubound(), 9);
+  EXPECT_EQ(user->ErrMsg(), u"Overflow");
+}
+
+TEST(KVUser, StreamInRefusesShortArraysAndOtherVersions) {
+  ByteArray good;
+  ASSERT_TRUE(sample()->StreamOut(good));
+
+  auto user = KVUser::create();
+  tUser before;
+  before.USERID = u"OLD";
+  user->v1User(before);
+
+  // Exactly the 848 bytes of the encoding are not enough; 849 are.
+  ByteArray exact(0, 847);
+  for (Long i = 0; i <= 847; ++i) exact(i) = good(i);
+  Long pos = 0;
+  EXPECT_FALSE(user->StreamIn(exact, pos));
+  EXPECT_EQ(pos, 0);
+  EXPECT_EQ(user->ErrMsg(), u"Stream is too small to contain user structure");
+  EXPECT_EQ(user->v1User(), before);
+  pos = std::numeric_limits<Long>::max() - 10;
+  EXPECT_FALSE(user->StreamIn(good, pos));
+  EXPECT_EQ(pos, std::numeric_limits<Long>::max() - 10);
+  EXPECT_EQ(user->ErrMsg(), u"Stream is too small to contain user structure");
+
+  // Another stamp: Position moves past it, the record stays.
+  ByteArray other_version = good;
+  other_version(0) = 0x9B;
+  pos = 0;
+  EXPECT_FALSE(user->StreamIn(other_version, pos));
+  EXPECT_EQ(pos, 4);
+  EXPECT_EQ(user->ErrMsg(), u"Client and Server KVData.DLL versions don't match");
+  EXPECT_EQ(user->v1User(), before);
+
+  // A stream loaded from a file starts at index 1. Read from index 0, its
+  // stamp cannot be read at all: one log entry, the stamp counts as 0, and
+  // Position stays.
+  ByteArray from_file(1, 849);
+  for (Long i = 1; i <= 849; ++i) from_file(i) = good(i - 1);
+  {
+    LogCapture log;
+    pos = 0;
+    EXPECT_FALSE(user->StreamIn(from_file, pos));
+    EXPECT_EQ(pos, 0);
+    EXPECT_EQ(log.entries.size(), 1u);
+    EXPECT_EQ(user->ErrMsg(), u"Client and Server KVData.DLL versions don't match");
+  }
+  pos = 1;
+  EXPECT_TRUE(user->StreamIn(from_file, pos));
+  EXPECT_EQ(pos, 849);
+  EXPECT_EQ(user->v1User().USERID, u"ABCD");
+
+  // An array without bounds fails on asking for them.
+  EXPECT_FALSE(user->StreamIn(ByteArray()));
+  EXPECT_EQ(user->ErrMsg(), u"Subscript out of range");
+}
+
+TEST(KVUser, IdentityAndRecordCopies) {
+  auto object = kvdata::CreateObject(u"KVData.KVUser");
+  const auto id = kvdata::query<kvdata::IKVObj>(object);
+  ASSERT_NE(id, nullptr);
+  EXPECT_EQ(id->ObjType(), u"User");
+  EXPECT_EQ(id->Description(), u"User");
+  EXPECT_TRUE(id->ID().is_empty());
+  EXPECT_TRUE(id->DateCreated().is_empty());
+  EXPECT_EQ(kvdata::query<kvdata::IKVStream>(object)->StreamLen(), 848);
+  EXPECT_EQ(kvdata::query<kvdata::IKVDBObject>(object), nullptr);
+  EXPECT_EQ(kvdata::query<kvdata::IKVSecurity>(object), nullptr);
+
+  auto user = kvdata::query<KVUser>(object);
+  tUser record = sample_user();
+  user->v1User(record);
+  record.USERID = u"CHANGED";
+  EXPECT_EQ(user->v1User().USERID, u"ABCD");
+}
+
+}  // namespace
