@@ -5,6 +5,7 @@
 #include <utility>
 
 #include "kvdata/streams/streams.hpp"
+#include "objects/detail/object_stream.hpp"
 #include "objects/detail/working_room.hpp"
 #include "streams/detail/checked_codec.hpp"
 #include "streams/detail/field_cursor.hpp"
@@ -49,7 +50,7 @@ bool KVProfile::IKVStream_StreamOut(ByteArray& bytStream, Long& Position) {
 bool KVProfile::write_stream(ByteArray& stream, Long& position) const {
   const auto room_end = detail::working_end(position, kWorkingRoom);
   if (!room_end) return false;
-  detail::set_stream_end(stream, *room_end);
+  detail::resize_stream(stream, *room_end);
 
   detail::FieldWriter head(stream, position);
   head.put_single(kStreamStamp).put_long(start_wl_).put_long(end_wl_).put_long(interval_);
@@ -65,7 +66,7 @@ bool KVProfile::write_stream(ByteArray& stream, Long& position) const {
     for (const tSpectrum& spectrum : band_width_) tail.put_spectrum(spectrum);
     ok = tail.ok();
   }
-  detail::set_stream_end(stream, position);
+  detail::resize_stream(stream, position);
   return ok;
 }
 

@@ -5,6 +5,7 @@
 #include <utility>
 
 #include "kvdata/streams/streams.hpp"
+#include "objects/detail/object_stream.hpp"
 #include "objects/detail/working_room.hpp"
 #include "streams/detail/checked_codec.hpp"
 
@@ -23,14 +24,14 @@ bool write_test_run_stream(Single version, tTestRun1& record, const String& ligh
                            ByteArray& stream, Long& position) {
   const auto room_end = detail::working_end(position, kWorkingRoom);
   if (!room_end) return false;
-  detail::set_stream_end(stream, *room_end);
+  detail::resize_stream(stream, *room_end);
 
   bool ok = checked::write_single(version, stream, position);
   if (ok) {
     ok = Streams::instance().Stream_TestRun(eStreamDirection::ToStream, stream, position, record);
   }
   if (ok) ok = checked::write_string(light_level_data, stream, position);
-  detail::set_stream_end(stream, position);
+  detail::resize_stream(stream, position);
   return ok;
 }
 

@@ -11,6 +11,7 @@
 
 #include "kvdata/kvdata.hpp"
 #include "objects/kv_profile_test_support.hpp"
+#include "support/error_number.hpp"
 
 namespace kvdata {
 namespace {
@@ -18,6 +19,7 @@ namespace {
 using testing::Bytes;
 using testing::contents;
 using testing::encoding;
+using testing::error_number;
 using testing::LogCapture;
 using testing::prefix;
 using testing::stream_of;
@@ -103,16 +105,6 @@ bool tables_equal(const KVProfile& a, const KVProfile& b) {
     }
   }
   return true;
-}
-
-template <class F>
-void expect_error_9(const F& f) {
-  try {
-    f();
-    ADD_FAILURE() << "no error raised";
-  } catch (const Error& e) {
-    EXPECT_EQ(e.number(), kSubscriptOutOfRange);
-  }
 }
 
 TEST(KVProfile, NewProfileStreamIsTheLiteral1649Bytes) {
@@ -217,13 +209,13 @@ TEST(KVProfile, CorrectionIndicesOutsideTheTablesRaiseError9AndChangeNothing) {
   const Bytes before = encoding(*p);
   const auto sc2 = static_cast<eSC>(2);
   const auto sc_minus = static_cast<eSC>(-1);
-  expect_error_9([&] { p->WaveCorrection(sc2, 1); });
-  expect_error_9([&] { p->DarkCorrection(kSCE, 0); });
-  expect_error_9([&] { p->WhiteCorrection(kSCI, 41, 1.0f); });
-  expect_error_9([&] { p->LinearCorrection(sc_minus, 1, 1.0f); });
-  expect_error_9([&] { p->BandWidthCorrection(kSCE, 0, 1.0f); });
-  expect_error_9([&] { p->BandWidthCorrection(sc2, 40); });
-  expect_error_9([&] { p->DarkCorrection(sc2, 40, 1.0f); });
+  EXPECT_EQ(error_number([&] { p->WaveCorrection(sc2, 1); }), kSubscriptOutOfRange);
+  EXPECT_EQ(error_number([&] { p->DarkCorrection(kSCE, 0); }), kSubscriptOutOfRange);
+  EXPECT_EQ(error_number([&] { p->WhiteCorrection(kSCI, 41, 1.0f); }), kSubscriptOutOfRange);
+  EXPECT_EQ(error_number([&] { p->LinearCorrection(sc_minus, 1, 1.0f); }), kSubscriptOutOfRange);
+  EXPECT_EQ(error_number([&] { p->BandWidthCorrection(kSCE, 0, 1.0f); }), kSubscriptOutOfRange);
+  EXPECT_EQ(error_number([&] { p->BandWidthCorrection(sc2, 40); }), kSubscriptOutOfRange);
+  EXPECT_EQ(error_number([&] { p->DarkCorrection(sc2, 40, 1.0f); }), kSubscriptOutOfRange);
   EXPECT_EQ(encoding(*p), before);
   EXPECT_EQ(p->LinearCorrection(kSCI, 40), table_value(3, 1, 40));
 }
