@@ -1,9 +1,14 @@
 #pragma once
-// The domain objects of the library.
+// The domain objects: users, tolerances, tolerance sets, tiles, tile sets,
+// calibrations, profiles, test runs and test-run tile deltas.
 
+#include "kvdata/objects/kv_cal_tile.hpp"
+#include "kvdata/objects/kv_calibration.hpp"
 #include "kvdata/objects/kv_profile.hpp"
 #include "kvdata/objects/kv_test_run.hpp"
 #include "kvdata/objects/kv_test_run_tiles_de.hpp"
+#include "kvdata/objects/kv_tile.hpp"
+#include "kvdata/objects/kv_tile_set.hpp"
 #include "kvdata/objects/kv_tol_set.hpp"
 #include "kvdata/objects/kv_tolerance.hpp"
 #include "kvdata/objects/kv_user.hpp"
