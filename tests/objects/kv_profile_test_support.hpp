@@ -1,5 +1,6 @@
 #pragma once
-// Test support for the profile and test-run tests: expected stream bytes laid
+// Test support for the profile and test-run tests (in a namespace of their
+// own, apart from the other object tests' helpers): expected stream bytes laid
 // out value by value by hand, streams built from bytes, an object's whole
 // encoding as a fingerprint of its state, and event-log capture.
 //
@@ -16,7 +17,7 @@
 
 #include "kvdata/kvdata.hpp"
 
-namespace kvdata::testing {
+namespace kvdata::profile_testing {
 
 using Bytes = std::vector<Byte>;
 
@@ -93,4 +94,4 @@ class LogCapture {
   EventLog::Sink previous_;
 };
 
-}  // namespace kvdata::testing
+}  // namespace kvdata::profile_testing
