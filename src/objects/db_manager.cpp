@@ -2,6 +2,8 @@
 
 #include "kvdata/automation/text.hpp"
 #include "kvdata/objects/kv_calibration.hpp"
+#include "kvdata/objects/kv_test_run.hpp"
+#include "kvdata/objects/kv_test_run_tiles_de.hpp"
 #include "kvdata/objects/kv_tile_set.hpp"
 #include "kvdata/objects/kv_tol_set.hpp"
 
@@ -92,6 +94,8 @@ std::shared_ptr<IKVObj> DBManager::IKVObjCreator_Create(const String& ObjectType
   }
   if (word == to_upper(u"TileSet")) return KVTileSet::create();
   if (word == to_upper(u"Calibration")) return KVCalibration::create();
+  if (word == to_upper(u"TestRunTileDEs")) return KVTestRunTilesDE::create();
+  if (word == to_upper(u"TestRun")) return KVTestRun::create();
   return nullptr;
 }
 

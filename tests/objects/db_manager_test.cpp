@@ -86,6 +86,20 @@ TEST(DBManager, OtherWordsGiveNewObjectsOfTheirKind) {
   ASSERT_NE(cal, nullptr);
   EXPECT_NE(std::dynamic_pointer_cast<KVCalibration>(cal), nullptr);
   EXPECT_NE(manager->Create(u"Calibration"), cal);
+
+  auto deltas = manager->Create(u"testruntiledes");
+  ASSERT_NE(deltas, nullptr);
+  EXPECT_NE(std::dynamic_pointer_cast<KVTestRunTilesDE>(deltas), nullptr);
+
+  // "TestRun" in any case and with surrounding blanks gives a new test run each time.
+  std::shared_ptr<IKVObj> previous;
+  for (const String word : {u"TestRun", u"testrun", u"TESTRUN", u"  TestRun  "}) {
+    auto run = manager->Create(word);
+    ASSERT_NE(run, nullptr) << to_utf8(word);
+    EXPECT_NE(std::dynamic_pointer_cast<KVTestRun>(run), nullptr);
+    EXPECT_NE(run, previous);
+    previous = run;
+  }
 }
 
 TEST(DBManager, NearMissWordsGiveNoObject) {
