@@ -236,5 +236,56 @@ TEST(CommandStreams, DecodeWarnsWhenTheJsonWouldNotGiveBackTheSameBytes) {
       << r.err;
 }
 
+TEST(CommandStreams, ATestRunKeepsTheVersionItsStreamCarries) {
+  Scratch s;
+  Json doc = Json::parse(slurp(json_of("testrun")));
+  doc["StreamVersion"] = 1.2;
+  spill(s.path("v12.json"), doc.dump(2) + "\n");
+  ASSERT_EQ(kvdata({"encode", s.path("v12.json"), "-o", s.path("v12.kvs")}).code, 0);
+  const std::string bytes = slurp(s.path("v12.kvs"));
+  EXPECT_EQ(bytes.substr(0, 4), std::string("\x9A\x99\x99\x3F"));
+  EXPECT_EQ(bytes.substr(4), slurp(stream_of("testrun")).substr(4));
+  const auto r = kvdata({"decode", "testrun", s.path("v12.kvs")});
+  ASSERT_EQ(r.code, 0) << r.err;
+  EXPECT_EQ(r.err, "");
+  EXPECT_EQ(Json::parse(r.out)["StreamVersion"].dump(), "1.2");
+}
+
+TEST(CommandStreams, EncodeRefusesWhatTheLibraryWouldCutOrCouldNotReadBack) {
+  Scratch s;
+  Json doc = Json::parse(slurp(json_of("calibration")));
+  doc["v1Calibration"]["TSN"] = "CT-4471-B";
+  spill(s.path("c.json"), doc.dump());
+  auto r = kvdata({"encode", s.path("c.json"), "-o", s.path("c.kvs")});
+  EXPECT_EQ(r.code, 1);
+  EXPECT_NE(r.err.find("v1Calibration.TSN: 9 UTF-16 code units, but the field holds 8"),
+            std::string::npos)
+      << r.err;
+
+  doc = Json::parse(slurp(json_of("tileset")));
+  doc["v1TileSet"]["Tiles"].erase(12);
+  spill(s.path("t.json"), doc.dump());
+  r = kvdata({"encode", s.path("t.json"), "-o", s.path("t.kvs")});
+  EXPECT_EQ(r.code, 1);
+  EXPECT_NE(r.err.find("v1TileSet.Tiles: 12 tiles, but a tile set has 13"), std::string::npos)
+      << r.err;
+
+  doc = Json::parse(slurp(json_of("tileset-calibration")));
+  doc["TSC"]["TSN"] = "CT-4472";
+  spill(s.path("tsc.json"), doc.dump());
+  r = kvdata({"encode", s.path("tsc.json"), "-o", s.path("tsc.kvs")});
+  EXPECT_EQ(r.code, 1);
+  EXPECT_NE(r.err.find("TSC.TSN: must equal TS.TSN"), std::string::npos) << r.err;
+
+  doc = Json::parse(slurp(json_of("user-block")));
+  doc["User"]["USERID"] = "joanna.smith";
+  spill(s.path("u.json"), doc.dump());
+  r = kvdata({"encode", s.path("u.json"), "-o", s.path("u.kvs")});
+  EXPECT_EQ(r.code, 1);
+  EXPECT_NE(r.err.find("User.USERID: 12 UTF-16 code units, but the field holds 8"),
+            std::string::npos);
+  EXPECT_FALSE(std::filesystem::exists(s.path("u.kvs")));
+}
+
 }  // namespace
 }  // namespace kvdata::cli

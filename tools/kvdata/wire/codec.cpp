@@ -59,13 +59,14 @@ Json decode_stream(StreamKind kind, std::span<const Byte> bytes) {
   doc["kind"] = std::string(kind_name(kind));
   try {
     if (codec::decode_record_stream(kind, a, doc) || codec::decode_user_objects(kind, a, doc) ||
-        codec::decode_tile_objects(kind, a, doc)) {
+        codec::decode_tile_objects(kind, a, doc) || codec::decode_profile_objects(kind, a, doc)) {
       return doc;
     }
   } catch (const Error& e) {
     bad_input("the " + std::string(kind_name(kind)) + " reader failed: " + e.what());
   }
-  bad_usage("decoding " + std::string(kind_name(kind)) + " streams is not available in this build");
+  // Every kind belongs to one of the groups above.
+  bad_usage("internal error: no reader for " + std::string(kind_name(kind)) + " streams");
 }
 
 std::vector<Byte> encode_stream(StreamKind kind, const Json& doc) {
@@ -73,13 +74,14 @@ std::vector<Byte> encode_stream(StreamKind kind, const Json& doc) {
   std::vector<Byte> out;
   try {
     if (codec::encode_record_stream(kind, doc, out) || codec::encode_user_objects(kind, doc, out) ||
-        codec::encode_tile_objects(kind, doc, out)) {
+        codec::encode_tile_objects(kind, doc, out) ||
+        codec::encode_profile_objects(kind, doc, out)) {
       return out;
     }
   } catch (const Error& e) {
     bad_input("the " + std::string(kind_name(kind)) + " writer failed: " + e.what());
   }
-  bad_usage("encoding " + std::string(kind_name(kind)) + " streams is not available in this build");
+  bad_usage("internal error: no writer for " + std::string(kind_name(kind)) + " streams");
 }
 
 }  // namespace kvdata::cli

@@ -53,6 +53,8 @@ bool decode_user_objects(StreamKind kind, const ByteArray& a, Json& doc);
 bool encode_user_objects(StreamKind kind, const Json& doc, std::vector<Byte>& out);
 bool decode_tile_objects(StreamKind kind, const ByteArray& a, Json& doc);
 bool encode_tile_objects(StreamKind kind, const Json& doc, std::vector<Byte>& out);
+bool decode_profile_objects(StreamKind kind, const ByteArray& a, Json& doc);
+bool encode_profile_objects(StreamKind kind, const Json& doc, std::vector<Byte>& out);
 
 }  // namespace codec
 }  // namespace kvdata::cli
