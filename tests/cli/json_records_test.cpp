@@ -137,6 +137,31 @@ TEST(JsonRecords, TextKeepsNulUnitsAndNonAsciiCharacters) {
   EXPECT_EQ(back.LastName, u"M\u00fcller \u20ac");
 }
 
+TEST(JsonRecords, RecordsWithoutAByteFormRoundTripToo) {
+  tTileDeltas deltas;
+  deltas.Deltas.redim(1, 2);
+  deltas.Deltas(2).dE(eSC::SCI) = 0.75f;
+  deltas.avgDeltaE(eSC::SCE) = 0.5f;
+  const Json j = write_record(deltas);
+  EXPECT_EQ(j["Deltas"][1]["dE"]["SCI"].dump(), "0.75");
+  EXPECT_EQ(j["avgDeltaE"]["SCE"].dump(), "0.5");
+  tTileDeltas back;
+  read_record(j, "D", back);
+  EXPECT_EQ(back, deltas);
+
+  tOVProfilePatch patch;
+  patch.ISN = u"SP64";
+  patch.ProfileData.Linear(eSC::SCE).Data(40) = 1.25f;
+  tOVProfilePatch patch_back;
+  read_record(write_record(patch), "P", patch_back);
+  EXPECT_EQ(patch_back, patch);
+
+  tTSListInfo info;
+  info.TSN = u"CT-4471";
+  info.Certified = Date{45313.0};
+  EXPECT_EQ(write_record(info)["Certified"], "2024-01-22");
+}
+
 TEST(JsonRecords, LightLevelSpectraMayBeLeftOut) {
   tTUD_LightLevels levels;
   Json j = write_record(levels);

@@ -160,6 +160,72 @@ TEST(Layouts, ToleranceSetMemberCountMustFit) {
   EXPECT_EQ(row(w, "Tolerances(2).MaxFail")->offset, 533u + 749 + 640);
 }
 
+TEST(Layouts, FixedBlocksPutEachFieldAtItsOffset) {
+  Walk w = walk_layout(StreamKind::Organization, zeros(133));
+  ASSERT_FALSE(w.problem);
+  EXPECT_EQ(row(w, "Org.Organization")->offset, 4u);
+  EXPECT_EQ(row(w, "Org.ParentOrgID")->offset, 104u);
+  EXPECT_EQ(row(w, "Org.RootOrgID")->offset, 108u);
+  EXPECT_EQ(row(w, "Org.Alias")->offset, 112u);
+  EXPECT_EQ(row(w, "Org.Avail")->offset, 128u);
+  EXPECT_EQ(row(w, "zero bytes")->offset, 130u);
+
+  w = walk_layout(StreamKind::UserBlock, zeros(261));
+  ASSERT_FALSE(w.problem);
+  EXPECT_EQ(row(w, "User.UserNumber")->offset, 16u);
+  EXPECT_EQ(row(w, "User.FirstName")->offset, 80u);
+  EXPECT_EQ(row(w, "User.UserMail")->offset, 156u);
+  EXPECT_EQ(row(w, "User.OrgID")->offset, 256u);
+  EXPECT_EQ(row(w, "User.RoleCode")->offset, 260u);
+  EXPECT_EQ(row(w, "User.RoleCode")->width, 1u);
+
+  w = walk_layout(StreamKind::Calibration, zeros(4189));
+  ASSERT_FALSE(w.problem);
+  EXPECT_EQ(row(w, "v1Calibration.Certified")->offset, 16u);
+  EXPECT_EQ(row(w, "v1Calibration.Tiles(1).SCE(1)")->offset, 28u);
+  EXPECT_EQ(row(w, "v1Calibration.Tiles(2).SCE(1)")->offset, 348u);
+  EXPECT_EQ(row(w, "v1Calibration.Tiles(13).SCI(40)")->offset, 4184u);
+  EXPECT_EQ(row(w, "spare byte")->offset, 4188u);
+
+  // A tile set: TSN "AB" (a 6-byte codec String), then 13 blocks of 264.
+  w = walk_layout(StreamKind::TileSet, Bytes{2, 0, 0, 0, 'A', 'B'} + zeros(13 * 264));
+  ASSERT_FALSE(w.problem);
+  EXPECT_EQ(row(w, "v1TileSet.Tiles(2).Name")->offset, 6u + 264);
+  EXPECT_EQ(row(w, "v1TileSet.Tiles(13).ColorRGB")->offset, 6u + 12 * 264 + 100);
+  EXPECT_EQ(row(w, "v1TileSet.Tiles(13).TempComp(40)")->offset, 6u + 13 * 264 - 4);
+
+  // A tolerance: limits after the 2-byte gap, Misc at 648, the dropped byte at 748.
+  w = walk_layout(StreamKind::Tolerance, zeros(749));
+  ASSERT_FALSE(w.problem);
+  EXPECT_EQ(row(w, "MinFail")->offset, 616u);
+  EXPECT_EQ(row(w, "MaxFail")->offset, 640u);
+  EXPECT_EQ(row(w, "Misc")->offset, 648u);
+  EXPECT_EQ(row(w, "trailing byte")->offset, 748u);
+}
+
+TEST(Layouts, ProfileObjectTablesAndBandWidthsFollowTheRecord) {
+  const Bytes head = Bytes{0x33, 0x33, 0xB3, 0x3F} + Bytes{0x68, 1, 0, 0} + Bytes{0xEE, 2, 0, 0} +
+                     Bytes{10, 0, 0, 0};
+  const Bytes record = Bytes{4, 0, 0, 0} + text("SP64") + zeros(8) + Bytes{1} + Bytes{16, 0, 0, 0} +
+                       text("tOVProfileDataV1") + zeros(1280);
+  const Walk w = walk_layout(StreamKind::Profile, head + record + zeros(320) + zeros(1));
+  ASSERT_FALSE(w.problem);
+  EXPECT_EQ(row(w, "StartWL")->value, "360");
+  EXPECT_EQ(row(w, "EndWl")->value, "750");
+  EXPECT_EQ(row(w, "ISN")->value, "\"SP64\"");
+  EXPECT_EQ(row(w, "Validated")->value, "True");
+  const std::size_t tables = 16 + 8 + 8 + 1 + 20;
+  EXPECT_EQ(row(w, "WaveCorrection.SCE(1)")->offset, tables + 4);
+  EXPECT_EQ(row(w, "DarkCorrection.SCI(40)")->offset, tables + 1276);
+  EXPECT_EQ(row(w, "BandWidthCorrection.SCE(1)")->offset, tables + 1280);
+  EXPECT_EQ(row(w, "BandWidthCorrection.SCI(1)")->offset, tables + 1280 + 160);
+  EXPECT_EQ(row(w, "spare byte")->offset, tables + 1600);
+
+  const Walk stamp = walk_layout(StreamKind::Profile, Bytes{0x9A, 0x99, 0x99, 0x3F} + record);
+  ASSERT_TRUE(stamp.problem);
+  EXPECT_EQ(stamp.problem->field, "stream version");
+}
+
 TEST(Layouts, IdentificationUsesStampsLengthsAndStructure) {
   EXPECT_EQ(identify(Bytes{0x9A, 0x99, 0x99, 0x3F} + zeros(845)).kind, StreamKind::User);
   EXPECT_EQ(identify(zeros(320)).kind, StreamKind::SCPair);

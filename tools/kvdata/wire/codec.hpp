@@ -11,7 +11,9 @@
 //   Json doc = decode_stream(StreamKind::Station, bytes);
 //   std::vector<Byte> again = encode_stream(StreamKind::Station, doc);
 
+#include <optional>
 #include <span>
+#include <string>
 #include <vector>
 
 #include "json/json.hpp"
