@@ -95,20 +95,20 @@ std::optional<std::string> iso_text(Date date) {
   if (!same_bits(compose(day, ms), d)) return std::nullopt;
 
   const Civil c = civil_from_days(day + kEpochOffset);
-  char buf[40];
+  const int year = static_cast<int>(c.y);  // 1 to 9999, checked above
+  char buf[128];
   if (ms == 0) {
-    std::snprintf(buf, sizeof buf, "%04lld-%02u-%02u", c.y, c.m, c.d);
+    std::snprintf(buf, sizeof buf, "%04d-%02u-%02u", year, c.m, c.d);
   } else {
-    const long long h = ms / 3'600'000;
-    const long long mi = ms / 60'000 % 60;
-    const long long s = ms / 1000 % 60;
-    const long long milli = ms % 1000;
+    const int h = static_cast<int>(ms / 3'600'000);
+    const int mi = static_cast<int>(ms / 60'000 % 60);
+    const int s = static_cast<int>(ms / 1000 % 60);
+    const int milli = static_cast<int>(ms % 1000);
     if (milli == 0) {
-      std::snprintf(buf, sizeof buf, "%04lld-%02u-%02uT%02lld:%02lld:%02lld", c.y, c.m, c.d, h, mi,
-                    s);
+      std::snprintf(buf, sizeof buf, "%04d-%02u-%02uT%02d:%02d:%02d", year, c.m, c.d, h, mi, s);
     } else {
-      std::snprintf(buf, sizeof buf, "%04lld-%02u-%02uT%02lld:%02lld:%02lld.%03lld", c.y, c.m, c.d,
-                    h, mi, s, milli);
+      std::snprintf(buf, sizeof buf, "%04d-%02u-%02uT%02d:%02d:%02d.%03d", year, c.m, c.d, h, mi, s,
+                    milli);
     }
   }
   return std::string(buf);
