@@ -33,6 +33,13 @@ TEST(CommandUsage, BadUsageExitsWithTwoAndBadInputWithOne) {
   EXPECT_EQ(kvdata({"colour", example("spectra/tiles.csv"), "--format", "xml"}).code, 2);
   EXPECT_EQ(
       kvdata({"plot", example("streams/scpair.kvs"), "-o", "/tmp/x.svg", "--sc", "both!"}).code, 2);
+  {
+    test::Scratch s;
+    test::spill(s.path("empty.kvs"), "");
+    r = kvdata({"decode", "station", s.path("empty.kvs")});
+    EXPECT_EQ(r.code, 1);
+    EXPECT_NE(r.err.find("empty.kvs: is empty"), std::string::npos) << r.err;
+  }
   r = kvdata({"explain", "/nonexistent/stream.kvs"});
   EXPECT_EQ(r.code, 1);
   EXPECT_NE(r.err.find("/nonexistent/stream.kvs: cannot open"), std::string::npos);

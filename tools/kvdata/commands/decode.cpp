@@ -86,12 +86,11 @@ void add_decode(CLI::App& app) {
       ->expected(1, 2);
   cmd->add_option("-o,--output", o->output,
                   "Write the JSON to this file instead of standard output");
-  cmd->footer(
-      "KIND is one of: " + kind_list() +
-      ".\nWithout KIND the stream is identified from its stamps, the profile's record name,\n"
-      "its counts and its length, and the conclusion is written to standard error.\n\n"
-      "Example:\n  kvdata decode examples/streams/tileset-calibration.kvs\n"
-      "  kvdata decode testrun examples/streams/testrun.kvs -o testrun.json");
+  cmd->footer("KIND is one of:\n" + kind_help() +
+              "Without KIND the stream is identified from its stamps, the profile's record name,\n"
+              "its counts and its length, and the conclusion is written to standard error.\n\n"
+              "Example:\n  kvdata decode examples/streams/tileset-calibration.kvs\n"
+              "  kvdata decode testrun examples/streams/testrun.kvs -o testrun.json");
   cmd->callback([o] { run_decode(*o); });
 }
 

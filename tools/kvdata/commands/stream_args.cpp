@@ -20,6 +20,7 @@ KindAndFile kind_and_file(const std::vector<std::string>& args) {
 
 StreamKind resolve_kind(std::optional<StreamKind> kind, std::span<const Byte> bytes,
                         const std::string& file, const std::string& command) {
+  if (bytes.empty()) bad_input(file + ": is empty; there is no stream to read");
   if (kind) return *kind;
   const Identification id = identify(bytes);
   if (!id.kind) {

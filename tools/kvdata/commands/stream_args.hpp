@@ -27,7 +27,8 @@ KindAndFile kind_and_file(const std::vector<std::string>& args);
 StreamKind require_kind(const std::string& word);
 
 // `kind` when given; otherwise the identified kind, announced on standard
-// error. When the stream cannot be told, a UsageError asks for KIND.
+// error. When the stream cannot be told, a UsageError asks for KIND; an empty
+// file is an InputError either way.
 StreamKind resolve_kind(std::optional<StreamKind> kind, std::span<const Byte> bytes,
                         const std::string& file, const std::string& command);
 

@@ -62,4 +62,14 @@ std::string kind_list() {
   return out;
 }
 
+std::string kind_help() {
+  std::string out;
+  for (const auto& k : kKinds) {
+    std::string line = "  " + std::string(k.name);
+    line.resize(24, ' ');
+    out += line + std::string(k.summary) + "\n";
+  }
+  return out;
+}
+
 }  // namespace kvdata::cli

@@ -45,5 +45,7 @@ std::string_view kind_name(StreamKind kind);
 std::optional<StreamKind> parse_kind(std::string_view word);
 // "user, tolerance, ..." for messages.
 std::string kind_list();
+// One line per kind with its summary, for --help.
+std::string kind_help();
 
 }  // namespace kvdata::cli
