@@ -1,0 +1,122 @@
+// Every object's StreamOut and StreamIn, next to memcpy of the same number of
+// bytes. StreamOut writes at Position 0 into an array that the previous
+// iteration left at the stream's full length (a caller that streams objects
+// repeatedly sees exactly this); StreamIn decodes that stream into one
+// object over and over. Figures are bytes per second of stream.
+
+#include <benchmark/benchmark.h>
+
+#include <cstddef>
+#include <functional>
+#include <memory>
+#include <stdexcept>
+#include <string>
+
+#include "bench_support.hpp"
+#include "kvdata/objects/kv_tol_set.hpp"
+#include "kvdata/objects/kv_tolerance.hpp"
+#include "kvdata/objects/kv_user.hpp"
+#include "kvdata/streams/streams.hpp"
+
+namespace kvdata::bench {
+namespace {
+
+// Registers StreamOut, StreamIn and memcpy for one object. `make` builds
+// the filled object; the stream it writes is what StreamIn reads back.
+void register_object(const std::string& name,
+                     const std::function<std::shared_ptr<IKVStream>()>& make,
+                     const std::function<std::shared_ptr<IKVStream>()>& make_empty) {
+  const std::shared_ptr<IKVStream> source = make();
+  ByteArray encoded(0, -1);
+  Long length = 0;
+  if (!source->StreamOut(encoded, length)) throw std::runtime_error(name + ": StreamOut failed");
+  const auto bytes = static_cast<std::size_t>(length);
+  const std::string base = "objects/" + name + "/";
+
+  benchmark::RegisterBenchmark((base + "StreamOut").c_str(), [=](benchmark::State& state) {
+    ByteArray stream = encoded;
+    for (auto _ : state) {
+      Long position = 0;
+      const bool ok = source->StreamOut(stream, position);
+      benchmark::DoNotOptimize(stream.data());
+      if (!ok || position != length) state.SkipWithError("StreamOut failed");
+    }
+    set_throughput(state, bytes, 1);
+  });
+
+  benchmark::RegisterBenchmark((base + "StreamIn").c_str(), [=](benchmark::State& state) {
+    const std::shared_ptr<IKVStream> target = make_empty();
+    for (auto _ : state) {
+      Long position = 0;
+      const bool ok = target->StreamIn(encoded, position);
+      benchmark::ClobberMemory();
+      if (!ok || position != length) state.SkipWithError("StreamIn failed");
+    }
+    set_throughput(state, bytes, 1);
+  });
+
+  register_memcpy(base + "memcpy", bytes);
+}
+
+String text_of(Lcg& rng, std::size_t length) {
+  String text;
+  for (std::size_t k = 0; k < length; ++k)
+    text.push_back(static_cast<char16_t>(u'a' + rng.next() % 26));
+  return text;
+}
+
+std::shared_ptr<IKVStream> make_user() {
+  tUser user;
+  user.USERID = u"jdoe";
+  user.UserNumber = 4711;
+  user.LastName = u"Doe";
+  user.FirstName = u"Jane";
+  user.UserPWD = u"secret";
+  user.UserMail = u"jane.doe@example.org";
+  user.OrgID = 12;
+  user.RoleCode = u"A";
+  user.Disabled = u"N";
+  auto object = KVUser::create();
+  object->v1User(user);
+  return object;
+}
+
+std::shared_ptr<KVTolerance> make_tolerance(Lcg& rng, Long id) {
+  auto tol = KVTolerance::create();
+  tol->ID(id);
+  tol->TolName(text_of(rng, 12));
+  tol->Description(text_of(rng, 60));
+  tol->MinFail(-2.0);
+  tol->MinWarn(-1.0);
+  tol->MaxWarn(1.0);
+  tol->MaxFail(2.0);
+  tol->Misc(text_of(rng, 8));
+  return tol;
+}
+
+// A tolerance set of 50 members keyed by their IDs.
+std::shared_ptr<IKVStream> make_tol_set() {
+  Lcg rng(2);
+  auto set = KVTolSet::create();
+  std::shared_ptr<IKVTolSet> as_set = set;
+  as_set->ID(7);
+  as_set->InstTypeID(3);
+  as_set->CreateDate(Date{45123.5});
+  as_set->Description(Variant(String(u"Benchmark tolerances")));
+  for (Long id = 1; id <= 50; ++id) {
+    const String key = Variant(id).to_string();
+    as_set->Add(make_tolerance(rng, id), key);
+  }
+  return set;
+}
+
+int register_all() {
+  register_object("User", make_user, [] { return KVUser::create(); });
+  register_object("TolSet_50", make_tol_set, [] { return KVTolSet::create(); });
+  return 0;
+}
+
+const int registered = register_all();
+
+}  // namespace
+}  // namespace kvdata::bench
