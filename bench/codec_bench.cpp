@@ -7,8 +7,8 @@
 #include <benchmark/benchmark.h>
 
 #include <cstddef>
-#include <utility>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "bench_support.hpp"
