@@ -42,6 +42,7 @@ void register_object(const std::string& name,
       if (!ok || position != length) state.SkipWithError("StreamOut failed");
     }
     set_throughput(state, bytes, 1);
+    state.counters["stream_bytes"] = static_cast<double>(bytes);
   });
 
   benchmark::RegisterBenchmark((base + "StreamIn").c_str(), [=](benchmark::State& state) {
@@ -110,9 +111,101 @@ std::shared_ptr<IKVStream> make_tol_set() {
   return set;
 }
 
+void fill_spectrum(Lcg& rng, tSpectrum& s) {
+  for (Single& v : s.Data) v = rng.uniform(0.0f, 100.0f);
+}
+
+tTestStats make_stats(Lcg& rng, Date start) {
+  tTestStats stats;
+  stats.TestResult = eTestResult::Pass;
+  stats.TestExplain = text_of(rng, 20);
+  stats.TestStart = start;
+  stats.TestEnd = Date{start.days + 0.01};
+  return stats;
+}
+
+// A test run whose inter-instrument-agreement test has two series of
+// `tiles` tiles each.
+tTestRun1 make_test_run_record(Long tiles) {
+  Lcg rng(3);
+  tTestRun1 run;
+  run.ISN = u"SN-0042-7731";
+  run.UserNumber = 4711;
+  run.StationGUID = u"{6F9619FF-8B86-D011-B42D-00C04FC964FF}";
+  run.TestDate = Date{45123.25};
+  run.Comment = u"Monthly check";
+  run.Stats = make_stats(rng, run.TestDate);
+  run.CommunicationsTest = make_stats(rng, run.TestDate);
+  run.LightLevels.Stats = make_stats(rng, run.TestDate);
+  for (tSpectrum& s : run.LightLevels.LightLevels) fill_spectrum(rng, s);
+  tTUD_Repeatability& rep = run.Repeatability;
+  rep.Stats = make_stats(rng, run.TestDate);
+  fill_spectrum(rng, rep.BlueTileStdDev);
+  fill_spectrum(rng, rep.WhiteTileStdDev);
+  rep.BlueTileMaxdE = 0.12f;
+  rep.WhiteTileMaxdE = 0.08f;
+  run.IIA.Stats = make_stats(rng, run.TestDate);
+  run.IIA.TSN = u"TS-0815";
+  run.IIA.CalStandard = Date{45000.0};
+  run.IIA.Has2Measurement = true;
+  for (Long m = 1; m <= 2; ++m) {
+    tIIATileSet& series = run.IIA.Measurements(m);
+    series.Profile = Date{45100.0 + m};
+    series.Tiles.redim(1, tiles);
+    for (tIIATile& tile : series.Tiles) {
+      for (tSpectrum& s : tile.Trial.Spectrum) fill_spectrum(rng, s);
+      for (tSpectrum& s : tile.TrialProfiled.Spectrum) fill_spectrum(rng, s);
+    }
+  }
+  return run;
+}
+
+// The test-run record stream that the test-run object writes after its
+// stamp, through the predeclared Streams instance.
+void register_test_run_record(const std::string& name, Long tiles) {
+  const auto record = std::make_shared<tTestRun1>(make_test_run_record(tiles));
+  ByteArray encoded(0, -1);
+  Long length = 0;
+  if (!Streams::instance().Stream_TestRun(eStreamDirection::ToStream, encoded, length, *record)) {
+    throw std::runtime_error(name + ": Stream_TestRun failed");
+  }
+  const auto bytes = static_cast<std::size_t>(length);
+  const std::string base = "records/" + name + "/";
+
+  benchmark::RegisterBenchmark((base + "StreamOut").c_str(), [=](benchmark::State& state) {
+    ByteArray stream = encoded;
+    for (auto _ : state) {
+      Long position = 0;
+      const bool ok =
+          Streams::instance().Stream_TestRun(eStreamDirection::ToStream, stream, position, *record);
+      benchmark::DoNotOptimize(stream.data());
+      if (!ok || position != length) state.SkipWithError("Stream_TestRun out failed");
+    }
+    set_throughput(state, bytes, 1);
+    state.counters["stream_bytes"] = static_cast<double>(bytes);
+  });
+
+  benchmark::RegisterBenchmark((base + "StreamIn").c_str(), [=](benchmark::State& state) {
+    ByteArray stream = encoded;
+    tTestRun1 target;
+    for (auto _ : state) {
+      Long position = 0;
+      const bool ok = Streams::instance().Stream_TestRun(eStreamDirection::FromStream, stream,
+                                                         position, target);
+      benchmark::ClobberMemory();
+      if (!ok || position != length) state.SkipWithError("Stream_TestRun in failed");
+    }
+    set_throughput(state, bytes, 1);
+  });
+
+  register_memcpy(base + "memcpy", bytes);
+}
+
 int register_all() {
   register_object("User", make_user, [] { return KVUser::create(); });
   register_object("TolSet_50", make_tol_set, [] { return KVTolSet::create(); });
+  register_test_run_record("TestRun_2x13", 13);
+  register_test_run_record("TestRun_2x1000", 1000);
   return 0;
 }
 

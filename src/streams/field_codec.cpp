@@ -5,6 +5,8 @@
 #include "kvdata/streams/field_codec.hpp"
 
 #include <new>
+#include <optional>
+#include <span>
 #include <stdexcept>
 #include <string_view>
 #include <utility>
@@ -138,10 +140,9 @@ template <class T, class Shown>
 template <class T, class Shown>
 bool write_fixed(std::u16string_view op, T wire, Shown shown, ByteArray& stream, Long& position) {
   constexpr Long width = static_cast<Long>(kWireWidth<T>);
-  if (position <= kLongMax - width) {
+  if (position <= kLongMax - width && stream.rank() == 1) {
     auto bytes = detail::window(stream, position, kWireWidth<T>);
-    if (!bytes && stream.has_bounds() && position >= stream.lbound() &&
-        stream.try_extend(position + width - 1)) {
+    if (!bytes && position >= stream.lbound() && stream.try_extend(position + width - 1)) {
       bytes = detail::window(stream, position, kWireWidth<T>);
     }
     if (bytes) {
@@ -189,6 +190,31 @@ bool read_fixed(std::u16string_view op, const ByteArray& stream, Long& position,
 }  // namespace
 
 namespace checked {
+
+std::optional<std::span<Byte>> reserve_run(ByteArray& stream, Long position,
+                                           std::size_t n) noexcept {
+  if (n == 0 || n > static_cast<std::size_t>(kLongMax)) return std::nullopt;
+  const auto width = static_cast<Long>(n);
+  if (stream.rank() != 1 || position < stream.lbound() || position > kLongMax - width) {
+    return std::nullopt;
+  }
+  const Long last = position + width - 1;
+  if (stream.ubound() < last && !stream.try_extend(last)) {
+    try {
+      stream.redim_preserve(stream.lbound(), last);
+    } catch (...) {
+      return std::nullopt;  // unchanged: the values one by one will log the failure
+    }
+  }
+  return detail::window(stream, position, n);
+}
+
+std::optional<std::span<const Byte>> peek_run(const ByteArray& stream, Long position,
+                                              std::size_t n) noexcept {
+  if (n == 0 || n > static_cast<std::size_t>(kLongMax)) return std::nullopt;
+  if (position > kLongMax - static_cast<Long>(n)) return std::nullopt;
+  return detail::window(stream, position, n);
+}
 
 bool write_integer(Integer value, ByteArray& stream, Long& position) {
   return write_fixed(u"IntegerToArray"sv, value, value, stream, position);
