@@ -13,6 +13,8 @@
 #include <string>
 
 #include "bench_support.hpp"
+#include "kvdata/objects/kv_calibration.hpp"
+#include "kvdata/objects/kv_tile_set.hpp"
 #include "kvdata/objects/kv_tol_set.hpp"
 #include "kvdata/objects/kv_tolerance.hpp"
 #include "kvdata/objects/kv_user.hpp"
@@ -111,10 +113,6 @@ std::shared_ptr<IKVStream> make_tol_set() {
   return set;
 }
 
-void fill_spectrum(Lcg& rng, tSpectrum& s) {
-  for (Single& v : s.Data) v = rng.uniform(0.0f, 100.0f);
-}
-
 tTestStats make_stats(Lcg& rng, Date start) {
   tTestStats stats;
   stats.TestResult = eTestResult::Pass;
@@ -122,6 +120,42 @@ tTestStats make_stats(Lcg& rng, Date start) {
   stats.TestStart = start;
   stats.TestEnd = Date{start.days + 0.01};
   return stats;
+}
+
+void fill_spectrum(Lcg& rng, tSpectrum& s) {
+  for (Single& v : s.Data) v = rng.uniform(0.0f, 100.0f);
+}
+
+// A tile set of 13 named tiles with their temperature compensation.
+std::shared_ptr<IKVStream> make_tile_set() {
+  Lcg rng(4);
+  tTileSet record;
+  record.TSN = u"TS-0815";
+  record.Tiles.redim(1, 13);
+  for (tTileDef& tile : record.Tiles) {
+    tile.Name = text_of(rng, 16);
+    tile.ColorRGB = static_cast<Long>(rng.next() & 0xFFFFFF);
+    fill_spectrum(rng, tile.TempComp);
+  }
+  auto set = KVTileSet::create();
+  set->v1TileSet(record);
+  return set;
+}
+
+// A calibration of 13 tiles, SCE and SCI spectra each.
+std::shared_ptr<IKVStream> make_calibration() {
+  Lcg rng(5);
+  tTileSetCalibration record;
+  record.TSN = u"TS-0815";
+  record.Certified = Date{45000.5};
+  record.TempCalibrated = 23.0f;
+  record.Tiles.redim(1, 13);
+  for (tSCPair& pair : record.Tiles) {
+    for (tSpectrum& s : pair.Spectrum) fill_spectrum(rng, s);
+  }
+  auto calibration = KVCalibration::create();
+  calibration->v1Calibration(record);
+  return calibration;
 }
 
 // A test run whose inter-instrument-agreement test has two series of
@@ -204,6 +238,8 @@ void register_test_run_record(const std::string& name, Long tiles) {
 int register_all() {
   register_object("User", make_user, [] { return KVUser::create(); });
   register_object("TolSet_50", make_tol_set, [] { return KVTolSet::create(); });
+  register_object("TileSet_13", make_tile_set, [] { return KVTileSet::create(); });
+  register_object("Calibration_13", make_calibration, [] { return KVCalibration::create(); });
   register_test_run_record("TestRun_2x13", 13);
   register_test_run_record("TestRun_2x1000", 1000);
   return 0;
