@@ -14,6 +14,8 @@
 
 #include "bench_support.hpp"
 #include "kvdata/objects/kv_calibration.hpp"
+#include "kvdata/objects/kv_profile.hpp"
+#include "kvdata/objects/kv_test_run.hpp"
 #include "kvdata/objects/kv_tile_set.hpp"
 #include "kvdata/objects/kv_tol_set.hpp"
 #include "kvdata/objects/kv_tolerance.hpp"
@@ -194,45 +196,35 @@ tTestRun1 make_test_run_record(Long tiles) {
   return run;
 }
 
-// The test-run record stream that the test-run object writes after its
-// stamp, through the predeclared Streams instance.
-void register_test_run_record(const std::string& name, Long tiles) {
-  const auto record = std::make_shared<tTestRun1>(make_test_run_record(tiles));
-  ByteArray encoded(0, -1);
-  Long length = 0;
-  if (!Streams::instance().Stream_TestRun(eStreamDirection::ToStream, encoded, length, *record)) {
-    throw std::runtime_error(name + ": Stream_TestRun failed");
+// A test-run object holding a run with two series of `tiles` tiles.
+std::shared_ptr<IKVStream> make_test_run(Long tiles) {
+  auto run = KVTestRun::create();
+  run->v1TestRun(make_test_run_record(tiles));
+  run->LightLevelData(u"8 levels, 40 bands, see station log");
+  return run;
+}
+
+// A profile with every table filled.
+std::shared_ptr<IKVStream> make_profile() {
+  Lcg rng(6);
+  auto profile = KVProfile::create();
+  std::shared_ptr<IKVProfile> p = profile;
+  p->ISN(u"SN-0042-7731");
+  p->Created(Date{45100.0});
+  p->Validated(true);
+  p->StartWL(360);
+  p->EndWl(750);
+  p->Interval(10);
+  for (const eSC sc : {eSC::SCE, eSC::SCI}) {
+    for (Long band = 1; band <= 40; ++band) {
+      p->WhiteCorrection(sc, band, rng.uniform(0.9f, 1.1f));
+      p->WaveCorrection(sc, band, rng.uniform(-1.0f, 1.0f));
+      p->LinearCorrection(sc, band, rng.uniform(0.9f, 1.1f));
+      p->DarkCorrection(sc, band, rng.uniform(0.0f, 0.1f));
+      p->BandWidthCorrection(sc, band, rng.uniform(9.0f, 11.0f));
+    }
   }
-  const auto bytes = static_cast<std::size_t>(length);
-  const std::string base = "records/" + name + "/";
-
-  benchmark::RegisterBenchmark((base + "StreamOut").c_str(), [=](benchmark::State& state) {
-    ByteArray stream = encoded;
-    for (auto _ : state) {
-      Long position = 0;
-      const bool ok =
-          Streams::instance().Stream_TestRun(eStreamDirection::ToStream, stream, position, *record);
-      benchmark::DoNotOptimize(stream.data());
-      if (!ok || position != length) state.SkipWithError("Stream_TestRun out failed");
-    }
-    set_throughput(state, bytes, 1);
-    state.counters["stream_bytes"] = static_cast<double>(bytes);
-  });
-
-  benchmark::RegisterBenchmark((base + "StreamIn").c_str(), [=](benchmark::State& state) {
-    ByteArray stream = encoded;
-    tTestRun1 target;
-    for (auto _ : state) {
-      Long position = 0;
-      const bool ok = Streams::instance().Stream_TestRun(eStreamDirection::FromStream, stream,
-                                                         position, target);
-      benchmark::ClobberMemory();
-      if (!ok || position != length) state.SkipWithError("Stream_TestRun in failed");
-    }
-    set_throughput(state, bytes, 1);
-  });
-
-  register_memcpy(base + "memcpy", bytes);
+  return profile;
 }
 
 int register_all() {
@@ -240,8 +232,11 @@ int register_all() {
   register_object("TolSet_50", make_tol_set, [] { return KVTolSet::create(); });
   register_object("TileSet_13", make_tile_set, [] { return KVTileSet::create(); });
   register_object("Calibration_13", make_calibration, [] { return KVCalibration::create(); });
-  register_test_run_record("TestRun_2x13", 13);
-  register_test_run_record("TestRun_2x1000", 1000);
+  register_object("Profile", make_profile, [] { return KVProfile::create(); });
+  register_object(
+      "TestRun_2x13", [] { return make_test_run(13); }, [] { return KVTestRun::create(); });
+  register_object(
+      "TestRun_2x1000", [] { return make_test_run(1000); }, [] { return KVTestRun::create(); });
   return 0;
 }
 
