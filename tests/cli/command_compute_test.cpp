@@ -1,0 +1,186 @@
+// kvdata colour, spread and plot on the shipped measurement files and streams.
+#include <gtest/gtest.h>
+#include <libxml/parser.h>
+#include <libxml/tree.h>
+
+#include <cmath>
+
+#include "command_runner.hpp"
+#include "json/json.hpp"
+
+namespace kvdata::cli {
+namespace {
+
+using test::example;
+using test::kvdata;
+using test::Scratch;
+using test::slurp;
+using test::spill;
+
+// The data-name of every <g class="series"> in an SVG file; fails the test
+// when the file is not well-formed XML.
+std::vector<std::string> svg_series(const std::string& path) {
+  std::vector<std::string> names;
+  xmlDoc* doc = xmlReadFile(path.c_str(), nullptr, XML_PARSE_NONET | XML_PARSE_NOERROR);
+  if (doc == nullptr) {
+    ADD_FAILURE() << path << " is not well-formed XML";
+    return names;
+  }
+  std::vector<xmlNode*> stack = {xmlDocGetRootElement(doc)};
+  while (!stack.empty()) {
+    xmlNode* n = stack.back();
+    stack.pop_back();
+    for (xmlNode* c = n->children; c != nullptr; c = c->next) {
+      if (c->type == XML_ELEMENT_NODE) stack.push_back(c);
+    }
+    xmlChar* cls = xmlGetProp(n, BAD_CAST "class");
+    if (cls != nullptr && std::string(reinterpret_cast<char*>(cls)) == "series") {
+      xmlChar* name = xmlGetProp(n, BAD_CAST "data-name");
+      names.emplace_back(reinterpret_cast<char*>(name));
+      xmlFree(name);
+    }
+    xmlFree(cls);
+  }
+  xmlFreeDoc(doc);
+  std::sort(names.begin(), names.end());
+  return names;
+}
+
+TEST(CommandCompute, CgatsAndCsvGiveIdenticalResults) {
+  for (const char* format : {"csv", "json", "table"}) {
+    const auto csv = kvdata({"colour", example("spectra/tiles.csv"), "--format", format});
+    const auto cgats = kvdata({"colour", example("spectra/tiles.cgats"), "--format", format});
+    ASSERT_EQ(csv.code, 0) << csv.err;
+    ASSERT_EQ(cgats.code, 0) << cgats.err;
+    if (std::string(format) == "csv") {
+      EXPECT_EQ(csv.out, cgats.out);
+    } else {
+      // Only the file names in the headings differ.
+      Json a = format == std::string("json") ? Json::parse(csv.out)
+                                             : Json(csv.out.substr(csv.out.find('\n')));
+      Json b = format == std::string("json") ? Json::parse(cgats.out)
+                                             : Json(cgats.out.substr(cgats.out.find('\n')));
+      if (a.is_object()) a.erase("file"), b.erase("file");
+      EXPECT_EQ(a, b);
+    }
+  }
+  const auto a = kvdata(
+      {"spread", example("spectra/white.csv"), example("spectra/blue.csv"), "--format", "csv"});
+  const auto b = kvdata(
+      {"spread", example("spectra/white.cgats"), example("spectra/blue.cgats"), "--format", "csv"});
+  ASSERT_EQ(a.code, 0) << a.err;
+  EXPECT_EQ(a.out, b.out);
+  EXPECT_EQ(std::count(a.out.begin(), a.out.end(), '\n'), 41);
+}
+
+TEST(CommandCompute, ColourAgainstAReferenceGivesTheDifferencesOfEachSample) {
+  const auto r = kvdata({"colour", example("spectra/tiles.csv"), "--against",
+                         example("spectra/tiles-certified.cgats"), "--format", "json"});
+  ASSERT_EQ(r.code, 0) << r.err;
+  const Json doc = Json::parse(r.out);
+  EXPECT_EQ(doc["illuminant"], "ILLUMINANT D65, 1964 OBSERVER, 10nm INTERVAL");
+  ASSERT_EQ(doc["samples"].size(), 13u);
+  for (const Json& s : doc["samples"]) {
+    EXPECT_EQ(s["sample"], s["reference"]);  // paired row by row
+    const double dL = s["dLAB"][0], da = s["dLAB"][1], db = s["dLAB"][2], dE = s["dE"];
+    EXPECT_NEAR(dE, std::sqrt(dL * dL + da * da + db * db), 1e-4);
+    EXPECT_LT(dE, 1.0);
+  }
+  // The white tile measured: a light, nearly neutral colour.
+  EXPECT_GT(doc["samples"][0]["LAB"][0].get<double>(), 95.0);
+  EXPECT_LT(std::fabs(doc["samples"][0]["LAB"][1].get<double>()), 1.0);
+
+  // One reference spectrum serves every sample; another count is refused.
+  Scratch s;
+  const std::string certified = slurp(example("spectra/tiles-certified.csv"));
+  spill(s.path("white-only.csv"),
+        certified.substr(0, certified.find('\n', certified.find('\n') + 1) + 1));
+  const auto one =
+      kvdata({"colour", example("spectra/tiles.csv"), "--against", s.path("white-only.csv")});
+  EXPECT_EQ(one.code, 0) << one.err;
+  const auto two =
+      kvdata({"colour", example("spectra/tiles.csv"), "--against", example("spectra/white.csv")});
+  EXPECT_EQ(two.code, 1);
+  EXPECT_NE(two.err.find("holds 20 spectra"), std::string::npos) << two.err;
+
+  const auto cgats = kvdata(
+      {"colour", example("spectra/tiles.csv"), "--format", "cgats", "-o", s.path("lab.cgats")});
+  ASSERT_EQ(cgats.code, 0) << cgats.err;
+  // The written CGATS file reads back (through the same Little CMS reader).
+  const auto back = kvdata({"colour", s.path("lab.cgats")});
+  EXPECT_EQ(back.code, 1);
+  EXPECT_NE(back.err.find("no spectral fields"), std::string::npos) << back.err;
+}
+
+TEST(CommandCompute, ShortSpectraAndBadFilesAreRefusedWithWhatIsWrong) {
+  for (const char* file : {"spectra/tiles-380-730.csv", "spectra/tiles-380-730.cgats"}) {
+    const auto r = kvdata({"colour", example(file)});
+    EXPECT_EQ(r.code, 1);
+    EXPECT_EQ(r.out, "");
+    EXPECT_NE(r.err.find("the spectra cover 380 to 730 nm at 10 nm (36 wavelengths); the 40 bands "
+                         "from 360 to 750 nm at 10 nm are needed (missing: 360, 370, 740, 750 nm)"),
+              std::string::npos)
+        << r.err;
+    const auto extended = kvdata({"colour", example(file), "--extend", "--format", "csv"});
+    EXPECT_EQ(extended.code, 0);
+    EXPECT_EQ(std::count(extended.out.begin(), extended.out.end(), '\n'), 14);
+  }
+  Scratch s;
+  spill(s.path("bad.csv"), "name,nm360\nA,12.5\nB,1x\n");
+  auto r = kvdata({"colour", s.path("bad.csv")});
+  EXPECT_EQ(r.code, 1);
+  EXPECT_NE(r.err.find(s.path("bad.csv") + " line 3, column nm360: not a number: \"1x\""),
+            std::string::npos);
+  spill(s.path("bad.cgats"), "CGATS.17\nBEGIN_DATA_FORMAT\nSAMPLE_ID\nEND_DATA_FORMAT\n");
+  r = kvdata({"spread", s.path("bad.cgats"), example("spectra/blue.csv")});
+  EXPECT_EQ(r.code, 1);
+  EXPECT_NE(r.err.find(s.path("bad.cgats") + ": not a readable CGATS file"), std::string::npos)
+      << r.err;
+  r = kvdata({"colour", s.path("absent.csv")});
+  EXPECT_EQ(r.code, 1);
+  EXPECT_NE(r.err.find(s.path("absent.csv") + ": cannot open"), std::string::npos);
+}
+
+TEST(CommandCompute, SpreadReportsTheStatisticsOfEachTile) {
+  Scratch s;
+  spill(s.path("w.csv"), "name,nm360\nW1,10\nW2,20\nW3,30\n");
+  spill(s.path("b.csv"), "name,nm360\nB1,5\nB2,5\n");
+  const auto r = kvdata({"spread", s.path("w.csv"), s.path("b.csv"), "--extend", "--format", "json",
+                         "--svg", s.path("spread.svg")});
+  ASSERT_EQ(r.code, 0) << r.err;
+  const Json doc = Json::parse(r.out);
+  EXPECT_EQ(doc["white"]["samples"], 3);
+  EXPECT_EQ(doc["white"]["average"][0], 20.0);
+  EXPECT_EQ(doc["white"]["lowest"][39], 10.0);
+  EXPECT_EQ(doc["white"]["highest"][20], 30.0);
+  EXPECT_EQ(doc["white"]["spread"][0], 20.0);
+  EXPECT_EQ(doc["white"]["stddev"][0], 10.0);  // sample standard deviation, n - 1
+  EXPECT_EQ(doc["blue"]["spread"][0], 0.0);
+  EXPECT_EQ(doc["blue"]["stddev"][0], 0.0);
+  EXPECT_EQ(svg_series(s.path("spread.svg")),
+            (std::vector<std::string>{"Blue tile (2 samples)", "White tile (3 samples)"}));
+}
+
+TEST(CommandCompute, PlotDrawsOneSeriesPerTileInWellFormedSvg) {
+  Scratch s;
+  auto r = kvdata({"plot", example("streams/tileset-calibration.kvs"), "-o", s.path("t.svg")});
+  ASSERT_EQ(r.code, 0) << r.err;
+  const auto names = svg_series(s.path("t.svg"));
+  ASSERT_EQ(names.size(), 13u);
+  EXPECT_NE(std::find(names.begin(), names.end(), "13. Deep Blue"), names.end());
+  // Tiles are drawn in their display colours: the deep blue tile's is #23328C.
+  EXPECT_NE(slurp(s.path("t.svg")).find("stroke=\"#23328C\""), std::string::npos);
+
+  r = kvdata({"plot", "calibration", example("streams/calibration.kvs"), "-o", s.path("c.svg"),
+              "--sc", "SCI"});
+  ASSERT_EQ(r.code, 0) << r.err;
+  EXPECT_EQ(svg_series(s.path("c.svg")).size(), 13u);
+  EXPECT_EQ(slurp(s.path("c.svg")).find("stroke-dasharray"), std::string::npos);
+
+  r = kvdata({"plot", example("streams/station.kvs"), "-o", s.path("x.svg")});
+  EXPECT_EQ(r.code, 2);
+  EXPECT_FALSE(std::filesystem::exists(s.path("x.svg")));
+}
+
+}  // namespace
+}  // namespace kvdata::cli

@@ -1,0 +1,156 @@
+// Reading measurement files and mapping them onto the 40 bands.
+#include <gtest/gtest.h>
+
+#include <filesystem>
+#include <fstream>
+
+#include "spectra/bands.hpp"
+#include "spectra/csv_reader.hpp"
+#include "spectra/spectra_table.hpp"
+#include "support/errors.hpp"
+
+namespace kvdata::cli {
+namespace {
+
+std::string error_of(auto&& f) {
+  try {
+    f();
+  } catch (const InputError& e) {
+    return e.what();
+  }
+  return "";
+}
+
+std::string header(int from, int to, int step, const std::string& prefix = "nm") {
+  std::string h = "SAMPLE_NAME";
+  for (int nm = from; nm <= to; nm += step) h += "," + prefix + std::to_string(nm);
+  return h;
+}
+
+std::string row(const std::string& name, int from, int to, int step) {
+  std::string r = name;
+  for (int nm = from; nm <= to; nm += step) r += "," + std::to_string(nm / 10) + ".5";
+  return r;
+}
+
+TEST(Spectra, WavelengthColumnNames) {
+  EXPECT_EQ(wavelength_of("360"), 360);
+  EXPECT_EQ(wavelength_of("nm360"), 360);
+  EXPECT_EQ(wavelength_of("SPECTRAL_NM750"), 750);
+  EXPECT_EQ(wavelength_of("SPECTRAL_405"), 405);
+  EXPECT_EQ(wavelength_of("R 380 nm"), 380);
+  EXPECT_EQ(wavelength_of("362.5"), 362.5);
+  EXPECT_LT(wavelength_of("SAMPLE_ID"), 0);
+  EXPECT_LT(wavelength_of("ID2"), 0);  // 2 nm is no visible wavelength
+  EXPECT_LT(wavelength_of("360x"), 0);
+  EXPECT_LT(wavelength_of("L*"), 0);
+}
+
+TEST(Spectra, CsvRowsQuotingAndSeparators) {
+  const std::string text = "# exported 2024-03-15\r\n" + header(360, 750, 10) + "\r\n\r\n" +
+                           row("\"White, glossy\"", 360, 750, 10) + "\r\n" +
+                           row("Blue", 360, 750, 10) + "\r\n";
+  const SpectraTable t = read_csv("t.csv", text);
+  ASSERT_EQ(t.rows.size(), 2u);
+  EXPECT_EQ(t.rows[0].name, "White, glossy");
+  EXPECT_EQ(t.rows[0].place, 4u);
+  EXPECT_EQ(t.rows[1].place, 5u);
+  ASSERT_EQ(t.wavelengths.size(), 40u);
+  EXPECT_EQ(t.rows[1].values[39], 75.5);
+
+  std::string semicolons = header(360, 750, 10) + "\n" + row("A", 360, 750, 10) + "\n";
+  for (char& c : semicolons) c = c == ',' ? ';' : c;
+  EXPECT_EQ(read_csv("s.csv", semicolons).rows.size(), 1u);
+}
+
+TEST(Spectra, CsvErrorsNameTheLineAndColumn) {
+  const std::string h = header(360, 750, 10);
+  EXPECT_EQ(error_of([&] { read_csv("t.csv", h + "\nA,1,2\n"); }),
+            "t.csv line 2: 3 cells, but the header has 41");
+  std::string bad = row("B", 360, 750, 10);
+  bad.replace(bad.find(",44.5"), 5, ",abc");
+  EXPECT_EQ(error_of([&] { read_csv("t.csv", h + "\n" + row("A", 360, 750, 10) + "\n" + bad); }),
+            "t.csv line 3, column nm440: not a number: \"abc\"");
+  EXPECT_NE(error_of([&] {
+              read_csv("t.csv", "name,colour\nA,red\n");
+            }).find("t.csv line 1: no wavelength columns"),
+            std::string::npos);
+  EXPECT_NE(error_of([&] { read_csv("t.csv", h + "\n\"A,1\n"); }).find("not closed"),
+            std::string::npos);
+}
+
+TEST(Spectra, FilesThatMissBandsAreRefusedWithTheirCoverage) {
+  SpectraTable t = read_csv("short.csv", header(380, 730, 10) + "\n" + row("A", 380, 730, 10));
+  const std::string message = error_of([&] { to_bands(t, false); });
+  EXPECT_NE(message.find("short.csv: the spectra cover 380 to 730 nm at 10 nm (36 wavelengths)"),
+            std::string::npos);
+  EXPECT_NE(message.find("missing: 360, 370, 740, 750 nm"), std::string::npos);
+  EXPECT_NE(message.find("--extend"), std::string::npos);
+
+  // --extend repeats the nearest measured band at either end.
+  const auto s = to_bands(t, true);
+  ASSERT_EQ(s.size(), 1u);
+  EXPECT_EQ(s[0].Data(1), 38.5f);  // 360 and 370 take 380
+  EXPECT_EQ(s[0].Data(2), 38.5f);
+  EXPECT_EQ(s[0].Data(3), 38.5f);
+  EXPECT_EQ(s[0].Data(4), 39.5f);
+  EXPECT_EQ(s[0].Data(39), 73.5f);  // 740 and 750 take 730
+  EXPECT_EQ(s[0].Data(40), 73.5f);
+
+  // A gap inside the range cannot be filled, --extend or not.
+  t = read_csv("wide.csv", header(360, 760, 20) + "\n" + row("A", 360, 760, 20));
+  const std::string gap = error_of([&] { to_bands(t, true); });
+  EXPECT_NE(gap.find("360 to 760 nm at 20 nm (21 wavelengths)"), std::string::npos);
+  EXPECT_NE(gap.find("cannot be filled"), std::string::npos);
+}
+
+TEST(Spectra, FinerAndWiderFilesGiveTheirTenNanometreBands) {
+  SpectraTable t = read_csv("fine.csv", header(340, 780, 5) + "\n" + row("A", 340, 780, 5));
+  const auto s = to_bands(t, false);
+  EXPECT_EQ(s[0].Data(1), 36.5f);
+  EXPECT_EQ(s[0].Data(40), 75.5f);
+  // Columns out of order are sorted by wavelength; a repeated wavelength is refused.
+  t = read_csv("o.csv", "nm370,nm360\n2,1\n");
+  order_columns(t);
+  EXPECT_EQ(t.wavelengths, (std::vector<double>{360, 370}));
+  EXPECT_EQ(t.rows[0].values, (std::vector<double>{1, 2}));
+  t = read_csv("d.csv", "nm360,360nm\n1,2\n");
+  EXPECT_NE(error_of([&] { order_columns(t); }).find("360 nm has two columns"), std::string::npos);
+}
+
+TEST(Spectra, CgatsErrorsComeFromLittleCmsOrNameTheSet) {
+  const auto dir = std::filesystem::temp_directory_path() / "kvdata_spectra_test";
+  std::filesystem::create_directories(dir);
+  const auto write = [&](const std::string& name, const std::string& text) {
+    std::ofstream(dir / name) << text;
+    return (dir / name).string();
+  };
+  const std::string good = write(
+      "good.cgats",
+      "CGATS.17\nNUMBER_OF_FIELDS 3\nBEGIN_DATA_FORMAT\nSAMPLE_NAME SPECTRAL_NM370 "
+      "SPECTRAL_NM360\nEND_DATA_FORMAT\nNUMBER_OF_SETS 2\nBEGIN_DATA\n\"Tile A\" 2.5 1.5\nB 4 "
+      "3\nEND_DATA\n");
+  const SpectraTable t = read_spectra(good);
+  EXPECT_EQ(t.format, "CGATS");
+  EXPECT_EQ(t.wavelengths, (std::vector<double>{360, 370}));
+  EXPECT_EQ(t.rows[0].name, "Tile A");
+  EXPECT_EQ(t.rows[0].values, (std::vector<double>{1.5, 2.5}));
+  EXPECT_EQ(t.where(t.rows[1]), good + " set 2");
+
+  const std::string missing =
+      write("missing.cgats",
+            "CGATS.17\nNUMBER_OF_FIELDS 2\nBEGIN_DATA_FORMAT\nSAMPLE_ID SPECTRAL_NM360\n"
+            "END_DATA_FORMAT\nNUMBER_OF_SETS 2\nBEGIN_DATA\n1 2.5\n2 x\nEND_DATA\n");
+  EXPECT_EQ(error_of([&] { read_spectra(missing); }),
+            missing + " set 2, field SPECTRAL_NM360: not a number: \"x\"");
+  const std::string broken =
+      write("broken.cgats", "CGATS.17\nBEGIN_DATA_FORMAT\nA B\nEND_DATA_FORMAT\nBEGIN_DATA\n1 2\n");
+  EXPECT_NE(error_of([&] { read_spectra(broken); }).find(broken + ": not a readable CGATS file"),
+            std::string::npos);
+  EXPECT_NE(error_of([&] { read_spectra((dir / "absent.csv").string()); }).find("cannot open"),
+            std::string::npos);
+  std::filesystem::remove_all(dir);
+}
+
+}  // namespace
+}  // namespace kvdata::cli

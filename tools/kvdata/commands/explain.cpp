@@ -1,0 +1,49 @@
+// kvdata explain [KIND] FILE: the stream field by field.
+#include <iostream>
+
+#include "commands/commands.hpp"
+#include "commands/stream_args.hpp"
+#include "support/errors.hpp"
+#include "support/files.hpp"
+#include "wire/explain_render.hpp"
+#include "wire/layouts.hpp"
+
+namespace kvdata::cli {
+namespace {
+
+struct ExplainOptions {
+  std::vector<std::string> args;
+  bool json = false;
+  std::string output;
+};
+
+void run_explain(const ExplainOptions& o) {
+  const auto [given, file] = kind_and_file(o.args);
+  const std::vector<Byte> bytes = read_bytes(file);
+  const StreamKind kind = resolve_kind(given, bytes, file, "explain");
+  const Walk walk = walk_layout(kind, bytes);
+  write_output(o.output, o.json ? render_walk_json(walk, bytes).dump(2) + "\n"
+                                : render_walk_table(walk, bytes));
+  if (walk.problem) bad_input(file + ": " + verdict(walk, bytes.size()));
+}
+
+}  // namespace
+
+void add_explain(CLI::App& app) {
+  auto o = std::make_shared<ExplainOptions>();
+  CLI::App* cmd = app.add_subcommand(
+      "explain", "Show a stream field by field: offset, width, raw bytes, decoded value");
+  cmd->add_option("args", o->args, "[KIND] FILE: the kind of stream (optional) and the stream file")
+      ->required()
+      ->expected(1, 2);
+  cmd->add_flag("--json", o->json, "Write the fields as JSON instead of a table");
+  cmd->add_option("-o,--output", o->output, "Write to this file instead of standard output");
+  cmd->footer(
+      "On a damaged stream the walk stops at the first field that cannot be read or does\n"
+      "not fit, says what was expected there, and the command exits with 1.\n\n"
+      "Example:\n  kvdata explain examples/streams/user.kvs\n"
+      "  kvdata explain tileset-calibration examples/streams/tileset-calibration.kvs");
+  cmd->callback([o] { run_explain(*o); });
+}
+
+}  // namespace kvdata::cli

@@ -1,0 +1,88 @@
+#include "spectra/bands.hpp"
+
+#include <cmath>
+#include <cstdio>
+#include <optional>
+
+#include "support/errors.hpp"
+
+namespace kvdata::cli {
+namespace {
+
+constexpr double kFirstNm = 360.0;
+constexpr double kStepNm = 10.0;
+
+std::string nm_text(double nm) {
+  if (nm == std::floor(nm)) return std::to_string(static_cast<long long>(nm));
+  char buf[32];
+  std::snprintf(buf, sizeof buf, "%g", nm);
+  return buf;
+}
+
+std::optional<std::size_t> column_at(const std::vector<double>& wavelengths, double nm) {
+  for (std::size_t i = 0; i < wavelengths.size(); ++i) {
+    if (std::fabs(wavelengths[i] - nm) < 1e-6) return i;
+  }
+  return std::nullopt;
+}
+
+}  // namespace
+
+std::string coverage(const std::vector<double>& wl) {
+  if (wl.empty()) return "no wavelengths";
+  if (wl.size() == 1) return "only " + nm_text(wl[0]) + " nm";
+  const double step = wl[1] - wl[0];
+  bool uniform = true;
+  for (std::size_t i = 2; i < wl.size(); ++i) {
+    uniform = uniform && std::fabs((wl[i] - wl[i - 1]) - step) < 1e-6;
+  }
+  std::string text = nm_text(wl.front()) + " to " + nm_text(wl.back()) + " nm";
+  if (uniform) text += " at " + nm_text(step) + " nm";
+  return text + " (" + std::to_string(wl.size()) + " wavelengths)";
+}
+
+std::vector<tSpectrum> to_bands(const SpectraTable& table, bool extend) {
+  // Column of each band, or none.
+  std::optional<std::size_t> column[41];
+  int first = 0;
+  int last = 0;
+  for (int band = 1; band <= 40; ++band) {
+    column[band] = column_at(table.wavelengths, kFirstNm + kStepNm * (band - 1));
+    if (column[band]) {
+      if (first == 0) first = band;
+      last = band;
+    }
+  }
+  std::string missing;
+  bool inner_gap = false;
+  for (int band = 1; band <= 40; ++band) {
+    if (column[band]) continue;
+    if (!missing.empty()) missing += ", ";
+    missing += nm_text(kFirstNm + kStepNm * (band - 1));
+    inner_gap = inner_gap || (first != 0 && band > first && band < last);
+  }
+  if (!missing.empty() && (!extend || inner_gap || first == 0)) {
+    std::string message =
+        table.file + ": the spectra cover " + coverage(table.wavelengths) +
+        "; the 40 bands from 360 to 750 nm at 10 nm are needed (missing: " + missing + " nm).";
+    if (inner_gap || first == 0) {
+      message += " Bands missing inside the range cannot be filled.";
+    } else {
+      message += " --extend fills missing end bands by repeating the nearest measured value.";
+    }
+    bad_input(message);
+  }
+  std::vector<tSpectrum> spectra;
+  spectra.reserve(table.rows.size());
+  for (const SpectrumRow& row : table.rows) {
+    tSpectrum s;
+    for (int band = 1; band <= 40; ++band) {
+      const int from = band < first ? first : band > last ? last : band;
+      s.Data(band) = static_cast<Single>(row.values[*column[from]]);
+    }
+    spectra.push_back(s);
+  }
+  return spectra;
+}
+
+}  // namespace kvdata::cli

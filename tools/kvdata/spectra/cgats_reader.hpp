@@ -1,0 +1,20 @@
+#pragma once
+// Spectra in CGATS (IT8) measurement files, parsed by Little CMS. Fields
+// whose names hold a wavelength (SPECTRAL_NM360, SPECTRAL_360, nm360) are the
+// spectrum; SAMPLE_NAME, or else SAMPLE_ID, names each set. Only the first
+// table of a multi-table file is read.
+//
+//   SpectraTable t = read_cgats("white.cgats");
+
+#include <string>
+
+#include "spectra/spectra_table.hpp"
+
+namespace kvdata::cli {
+
+// InputError carries Little CMS's own message (with the line it names) for a
+// file it cannot parse, and names the set and field of a missing or
+// non-numeric value.
+SpectraTable read_cgats(const std::string& path);
+
+}  // namespace kvdata::cli

@@ -1,0 +1,75 @@
+#include "spectra/spectra_table.hpp"
+
+#include <algorithm>
+#include <cctype>
+#include <charconv>
+#include <numeric>
+
+#include "spectra/cgats_reader.hpp"
+#include "spectra/csv_reader.hpp"
+#include "support/errors.hpp"
+#include "support/files.hpp"
+
+namespace kvdata::cli {
+
+std::string SpectraTable::where(const SpectrumRow& row) const {
+  return file + (format == "CGATS" ? " set " : " line ") + std::to_string(row.place);
+}
+
+std::string SpectraTable::label(const SpectrumRow& row) const {
+  if (!row.name.empty()) return row.name;
+  return (format == "CGATS" ? "set " : "line ") + std::to_string(row.place);
+}
+
+double wavelength_of(const std::string& column) {
+  // Letters, blanks and underscores, then the number, then an optional "nm".
+  std::size_t i = 0;
+  while (i < column.size() && (std::isalpha(static_cast<unsigned char>(column[i])) ||
+                               column[i] == '_' || column[i] == ' ')) {
+    ++i;
+  }
+  if (i == column.size() || !std::isdigit(static_cast<unsigned char>(column[i]))) return -1;
+  double nm = 0;
+  const auto r = std::from_chars(column.data() + i, column.data() + column.size(), nm);
+  if (r.ec != std::errc{}) return -1;
+  std::string rest(r.ptr, column.data() + column.size());
+  rest.erase(std::remove(rest.begin(), rest.end(), ' '), rest.end());
+  std::transform(rest.begin(), rest.end(), rest.begin(),
+                 [](unsigned char c) { return static_cast<char>(std::tolower(c)); });
+  if (!rest.empty() && rest != "nm") return -1;
+  if (nm < 300 || nm > 1100) return -1;
+  return nm;
+}
+
+void order_columns(SpectraTable& table) {
+  std::vector<std::size_t> order(table.wavelengths.size());
+  std::iota(order.begin(), order.end(), std::size_t{0});
+  std::stable_sort(order.begin(), order.end(), [&](std::size_t a, std::size_t b) {
+    return table.wavelengths[a] < table.wavelengths[b];
+  });
+  std::vector<double> wl;
+  for (std::size_t i : order) wl.push_back(table.wavelengths[i]);
+  for (std::size_t i = 1; i < wl.size(); ++i) {
+    if (wl[i] == wl[i - 1]) {
+      bad_input(table.file + ": the wavelength " + std::to_string(static_cast<long long>(wl[i])) +
+                " nm has two columns");
+    }
+  }
+  for (SpectrumRow& row : table.rows) {
+    std::vector<double> v;
+    for (std::size_t i : order) v.push_back(row.values[i]);
+    row.values = std::move(v);
+  }
+  table.wavelengths = std::move(wl);
+}
+
+SpectraTable read_spectra(const std::string& path) {
+  const std::string text = read_text(path);
+  SpectraTable table =
+      text.find("BEGIN_DATA_FORMAT") != std::string::npos ? read_cgats(path) : read_csv(path, text);
+  order_columns(table);
+  if (table.rows.empty()) bad_input(path + ": holds no spectra (no data rows)");
+  return table;
+}
+
+}  // namespace kvdata::cli
