@@ -9,25 +9,31 @@
 #   scripts/run-fuzzers.sh                 # 20 s per target (CI)
 #   scripts/run-fuzzers.sh 3600            # an hour per target
 #   scripts/run-fuzzers.sh --runs=10000000 kv_tol_set_fuzz   # a number of executions
+#   scripts/run-fuzzers.sh --runs=10000000 1800   # whichever ends first
+#
+# KVDATA_FUZZ_CORPUS_DIR=<dir> keeps the working corpora there between runs
+# (seeded from fuzz/corpus on first use) instead of in a scratch directory;
+# KVDATA_FUZZ_BIN_DIR=<dir> runs targets copied elsewhere (so that a long run
+# is not disturbed by a rebuild).
 #
 # The targets must be built first:
 #   cmake --preset fuzz && cmake --build --preset fuzz
 set -euo pipefail
 cd "$(dirname "$0")/.."
 
-seconds=20
+seconds=""
 runs=""
 targets=()
 for arg in "$@"; do
   case "$arg" in
     --runs=*) runs="${arg#--runs=}" ;;
-    -h|--help) sed -n '2,15p' "$0"; exit 0 ;;
+    -h|--help) awk 'NR > 1 && /^#/ { sub(/^# ?/, ""); print; next } NR > 1 { exit }' "$0"; exit 0 ;;
     *[!0-9]*) targets+=("$arg") ;;
     *) seconds="$arg" ;;
   esac
 done
 
-bin_dir=build/fuzz/fuzz
+bin_dir="${KVDATA_FUZZ_BIN_DIR:-build/fuzz/fuzz}"
 findings=build/fuzz/findings
 if [ "${#targets[@]}" -eq 0 ]; then
   for bin in "$bin_dir"/*_fuzz; do
@@ -48,11 +54,12 @@ export ASAN_OPTIONS="${ASAN_OPTIONS:-detect_leaks=1:abort_on_error=0}"
 export UBSAN_OPTIONS="${UBSAN_OPTIONS:-print_stacktrace=1:halt_on_error=1}"
 
 limits=(-rss_limit_mb=256 -malloc_limit_mb=64 -timeout=10 -print_final_stats=1)
-if [ -n "$runs" ]; then
-  budget=(-runs="$runs")
-else
-  budget=(-max_total_time="$seconds")
-fi
+# A number of executions, a time, or both (whichever ends first); 20 s when
+# neither is given.
+budget=()
+[ -n "$runs" ] && budget+=(-runs="$runs")
+[ -n "$seconds" ] && budget+=(-max_total_time="$seconds")
+[ "${#budget[@]}" -eq 0 ] && budget+=(-max_total_time=20)
 
 failed=()
 printf '%-28s %12s %8s %8s %8s  %s\n' target executions cov ft corpus result
@@ -63,7 +70,7 @@ for target in "${targets[@]}"; do
     failed+=("$target")
     continue
   fi
-  corpus="$scratch/$target"
+  corpus="${KVDATA_FUZZ_CORPUS_DIR:-$scratch}/$target"
   mkdir -p "$corpus"
   if [ -d "fuzz/corpus/$target" ]; then
     cp -R "fuzz/corpus/$target/." "$corpus/"
