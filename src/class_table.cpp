@@ -1,9 +1,11 @@
 // The table of creatable classes, one line per class, in the order in which
 // the library lists them. Interface classes and facades are not creatable.
 #include "kvdata/automation/create_object.hpp"
+#include "kvdata/colour/ilu_d6510.hpp"
 #include "kvdata/objects/kv_tol_set.hpp"
 #include "kvdata/objects/kv_tolerance.hpp"
 #include "kvdata/objects/kv_user.hpp"
+#include "kvdata/stats/kv_test_run_spread_test_data.hpp"
 #include "kvdata/streams/streams.hpp"
 
 namespace kvdata {
@@ -15,9 +17,11 @@ std::shared_ptr<Object> make() {
 }
 
 constexpr CreatableClass kClasses[] = {
+    {u"KVData.ILU_D6510", &make<ILU_D6510>},
     {u"KVData.KVUser", &make<KVUser>},
     {u"KVData.KVTolerance", &make<KVTolerance>},
     {u"KVData.KVTolSet", &make<KVTolSet>},
+    {u"KVData.KVTestRunSpreadTestData", &make<KVTestRunSpreadTestData>},
     {u"KVData.Streams", &make<Streams>},
 };
 

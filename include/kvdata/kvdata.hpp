@@ -9,3 +9,5 @@
 #include "kvdata/foundation.hpp"
 #include "kvdata/objects.hpp"
 #include "kvdata/streams.hpp"
+#include "kvdata/colour.hpp"
+#include "kvdata/stats.hpp"

@@ -2,20 +2,14 @@
 
 #include <gtest/gtest.h>
 
+#include "support/error_number.hpp"
+
 #include <vector>
 
 namespace kvdata {
 namespace {
 
-template <class F>
-Long error_number(F&& f) {
-  try {
-    f();
-  } catch (const Error& e) {
-    return e.number();
-  }
-  return 0;
-}
+using testing::error_number;
 
 TEST(Collection, KeepsInsertionOrderAndFindsKeysWithoutRegardToCase) {
   Collection c;

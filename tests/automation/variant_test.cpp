@@ -2,6 +2,8 @@
 
 #include <gtest/gtest.h>
 
+#include "support/error_number.hpp"
+
 #include <limits>
 
 namespace kvdata {
@@ -9,15 +11,7 @@ namespace {
 
 struct Tracked : Object {};
 
-template <class F>
-Long error_number(F&& f) {
-  try {
-    f();
-  } catch (const Error& e) {
-    return e.number();
-  }
-  return 0;
-}
+using testing::error_number;
 
 TEST(Variant, TypeTagsUseTheAutomationNumbers) {
   EXPECT_EQ(Variant().type(), VarType::Empty);

@@ -1,0 +1,313 @@
+#include "kvdata/stats/kv_test_run_spread_test_data.hpp"
+
+#include <cmath>
+#include <string>
+#include <utility>
+
+#include "kvdata/automation/error.hpp"
+
+namespace kvdata {
+namespace {
+
+constexpr Long kWhiteRow = 1;
+constexpr Long kBlueRow = 2;
+constexpr Single kLowestStart = 9999.0f;
+constexpr Single kHighestStart = -9999.0f;
+
+// A number stored into a table; out of the Single range (or NaN) raises 6.
+Single to_single(Double value) {
+  const auto s = static_cast<Single>(value);
+  if (!std::isfinite(s)) raise(kOverflow);
+  return s;
+}
+
+Double as_number(Byte v) {
+  return static_cast<Double>(v);
+}
+Double as_number(Integer v) {
+  return static_cast<Double>(v);
+}
+Double as_number(Long v) {
+  return static_cast<Double>(v);
+}
+Double as_number(Single v) {
+  return static_cast<Double>(v);
+}
+Double as_number(Double v) {
+  return v;
+}
+Double as_number(const String& v) {
+  return Variant(v).to_double();
+}
+Double as_number(const Variant& v) {
+  return v.to_double();
+}
+
+// Calls f with the array a Variant holds, whatever its element type;
+// a Variant holding no array raises error 13.
+template <class F>
+auto with_array(const Variant& v, F&& f) {
+  if (const auto* a = v.get_if<Array<Single>>()) return f(*a);
+  if (const auto* a = v.get_if<Array<Double>>()) return f(*a);
+  if (const auto* a = v.get_if<Array<Variant>>()) return f(*a);
+  if (const auto* a = v.get_if<Array<Long>>()) return f(*a);
+  if (const auto* a = v.get_if<Array<Integer>>()) return f(*a);
+  if (const auto* a = v.get_if<Array<Byte>>()) return f(*a);
+  if (const auto* a = v.get_if<Array<String>>()) return f(*a);
+  raise(kTypeMismatch);
+}
+
+// Element i of the array in `v`, as a number.
+Double element(const Variant& v, Long i) {
+  return with_array(v, [i](const auto& a) { return as_number(a(i)); });
+}
+
+// Bounds of the first dimension of the array in `v` (error 9 without one).
+Bounds first_dimension(const Variant& v) {
+  return with_array(v, [](const auto& a) { return Bounds{a.lbound(1), a.ubound(1)}; });
+}
+
+String decimal(Long n) {
+  const std::string digits = std::to_string(n);
+  return String(digits.begin(), digits.end());
+}
+
+}  // namespace
+
+std::shared_ptr<KVTestRunSpreadTestData> KVTestRunSpreadTestData::create() {
+  return std::make_shared<KVTestRunSpreadTestData>();
+}
+
+Integer KVTestRunSpreadTestData::CheckState() const {
+  if (!initialised_) return kNotReady;
+  if (current_test_index_ == 0) return kNotReady;
+  return kSuccess;
+}
+
+const Collection& KVTestRunSpreadTestData::current_samples() const {
+  const auto& samples = current_test_index_ == kWhiteRow ? white_samples_ : blue_samples_;
+  if (!samples) raise(kObjectNotSet);
+  return *samples;
+}
+
+Integer KVTestRunSpreadTestData::KVRR_SetStdDev(const Variant& vData) {
+  if (const Integer status = CheckState(); status != kSuccess) return status;
+  for (Long i = 1; i <= points_; ++i) {
+    std_dev_(current_test_index_, i) = to_single(element(vData, i));
+  }
+  return kSuccess;
+}
+
+Integer KVTestRunSpreadTestData::KVRR_GetNumberOfSpectralDataPoints() const {
+  return points_;
+}
+
+Integer KVTestRunSpreadTestData::KVRR_AddSpectralData(const Variant& vReflectaceData) {
+  if (const Integer status = CheckState(); status != kSuccess) return status;
+  const Bounds bounds = first_dimension(vReflectaceData);
+  if (bounds.upper != points_ || bounds.lower != 1) return kSuccess;
+  const std::shared_ptr<Collection>* target = nullptr;
+  if (white_selected_) {
+    target = &white_samples_;
+  } else if (blue_selected_) {
+    target = &blue_samples_;
+  } else {
+    return kSuccess;
+  }
+  if (!*target) raise(kObjectNotSet);
+  Collection& samples = **target;
+  // The key is the count plus one. A caller may have removed samples from
+  // the collection it was handed, so that key may be taken already; then
+  // the next free number is used rather than refusing the sample.
+  Long number = samples.Count() + 1;
+  while (samples.Contains(decimal(number))) ++number;
+  // The Variant's copy is the caller's array copied whole.
+  samples.Add(vReflectaceData, decimal(number));
+  return kSuccess;
+}
+
+Integer KVTestRunSpreadTestData::KVRR_CalculateSpreadTestData() {
+  Integer status = CheckState();
+  for (Integer tile = kWhiteRow; tile <= kBlueRow; ++tile) {
+    current_test_index_ = tile;
+    if (status == kSuccess) status = CalcAverageWL();
+    if (status == kSuccess) status = CalcLowestWL();
+    if (status == kSuccess) status = CalcHighestWL();
+    if (status == kSuccess) status = CalcSpreadOfEachWL();
+  }
+  return status;
+}
+
+Integer KVTestRunSpreadTestData::CalcAverageWL() {
+  if (const Integer status = CheckState(); status != kSuccess) return status;
+  const Collection& samples = current_samples();
+  if (samples.Count() == 0) return kNoSamples;
+  const Long row = current_test_index_;
+  const Long first = average_.lbound(2);
+  const Long last = average_.ubound(2);
+  for (Long i = first; i <= last; ++i) average_(row, i) = 0.0f;
+  for (const Variant& sample : samples) {
+    for (Long i = first; i <= last; ++i) {
+      average_(row, i) = to_single(static_cast<Double>(average_(row, i)) + element(sample, i));
+    }
+  }
+  const auto count = static_cast<Double>(samples.Count());
+  for (Long i = first; i <= last; ++i) {
+    average_(row, i) = to_single(static_cast<Double>(average_(row, i)) / count);
+  }
+  return kSuccess;
+}
+
+Integer KVTestRunSpreadTestData::CalcLowestWL() {
+  if (const Integer status = CheckState(); status != kSuccess) return status;
+  const Collection& samples = current_samples();
+  if (samples.Count() == 0) return kNoSamples;
+  const Long row = current_test_index_;
+  const Long first = lowest_.lbound(2);
+  const Long last = lowest_.ubound(2);
+  for (Long i = first; i <= last; ++i) lowest_(row, i) = kLowestStart;
+  for (const Variant& sample : samples) {
+    for (Long i = first; i <= last; ++i) {
+      const Double value = element(sample, i);
+      if (static_cast<Double>(lowest_(row, i)) > value) lowest_(row, i) = to_single(value);
+    }
+  }
+  return kSuccess;
+}
+
+Integer KVTestRunSpreadTestData::CalcHighestWL() {
+  if (const Integer status = CheckState(); status != kSuccess) return status;
+  const Collection& samples = current_samples();
+  if (samples.Count() == 0) return kNoSamples;
+  const Long row = current_test_index_;
+  const Long first = highest_.lbound(2);
+  const Long last = highest_.ubound(2);
+  for (Long i = first; i <= last; ++i) highest_(row, i) = kHighestStart;
+  for (const Variant& sample : samples) {
+    for (Long i = first; i <= last; ++i) {
+      const Double value = element(sample, i);
+      if (static_cast<Double>(highest_(row, i)) < value) highest_(row, i) = to_single(value);
+    }
+  }
+  return kSuccess;
+}
+
+Integer KVTestRunSpreadTestData::CalcSpreadOfEachWL() {
+  if (const Integer status = CheckState(); status != kSuccess) return status;
+  const Long row = current_test_index_;
+  const Long first = spread_.lbound(2);
+  const Long last = spread_.ubound(2);
+  for (Long i = first; i <= last; ++i) spread_(row, i) = 0.0f;
+  for (Long i = first; i <= last; ++i) {
+    spread_(row, i) =
+        to_single(static_cast<Double>(highest_(row, i)) - static_cast<Double>(lowest_(row, i)));
+  }
+  return kSuccess;
+}
+
+std::shared_ptr<Collection> KVTestRunSpreadTestData::KVRR_GetWhiteRepeatibilitySpectralData()
+    const {
+  return white_samples_;
+}
+
+std::shared_ptr<Collection> KVTestRunSpreadTestData::KVRR_GetBlueRepeatibilitySpectralData() const {
+  return blue_samples_;
+}
+
+Variant KVTestRunSpreadTestData::KVRR_GetAverageWL() const {
+  return average_;
+}
+Variant KVTestRunSpreadTestData::KVRR_GetLowestWL() const {
+  return lowest_;
+}
+Variant KVTestRunSpreadTestData::KVRR_GetHighestWL() const {
+  return highest_;
+}
+Variant KVTestRunSpreadTestData::KVRR_GetSpreadOfEachWL() const {
+  return spread_;
+}
+Variant KVTestRunSpreadTestData::KVRR_GetStdDev() const {
+  return std_dev_;
+}
+
+Variant KVTestRunSpreadTestData::KVRR_SetCurrentTestToWhiteTile() {
+  white_selected_ = true;
+  blue_selected_ = false;
+  current_test_index_ = kWhiteRow;
+  return Variant();
+}
+
+Variant KVTestRunSpreadTestData::KVRR_SetCurrentTestToBlueTile() {
+  blue_selected_ = true;
+  white_selected_ = false;
+  current_test_index_ = kBlueRow;
+  return Variant();
+}
+
+Integer KVTestRunSpreadTestData::KVRR_GetCurrentTestIndex() const {
+  return current_test_index_;
+}
+
+void KVTestRunSpreadTestData::dimension_tables(Long points) {
+  for (Array<Single>* table : {&average_, &lowest_, &highest_, &spread_, &std_dev_}) {
+    table->redim(Bounds{kWhiteRow, kBlueRow}, Bounds{1, points});
+  }
+}
+
+Integer KVTestRunSpreadTestData::KVRR_Initialize(const Integer& nNumberOfSpectralDataPts) {
+  try {
+    points_ = nNumberOfSpectralDataPts;
+    current_test_index_ = 0;
+    if (points_ < 1) return kNotReady;
+    white_samples_ = Collection::create();
+    blue_samples_ = Collection::create();
+    dimension_tables(points_);
+    initialised_ = true;
+    return kSuccess;
+  } catch (const Error&) {
+    return kCaughtError;
+  }
+}
+
+Integer KVTestRunSpreadTestData::KVRR_Copy(std::shared_ptr<KVTestRunSpreadTestData> obj) {
+  try {
+    if (!obj) raise(kObjectNotSet);
+    points_ = obj->KVRR_GetNumberOfSpectralDataPoints();
+    current_test_index_ = 0;
+    white_samples_ = obj->KVRR_GetWhiteRepeatibilitySpectralData();
+    blue_samples_ = obj->KVRR_GetBlueRepeatibilitySpectralData();
+    current_test_index_ = obj->KVRR_GetCurrentTestIndex();
+    average_ = obj->KVRR_GetAverageWL().get<Array<Single>>();
+    highest_ = obj->KVRR_GetHighestWL().get<Array<Single>>();
+    lowest_ = obj->KVRR_GetLowestWL().get<Array<Single>>();
+    spread_ = obj->KVRR_GetSpreadOfEachWL().get<Array<Single>>();
+    std_dev_ = obj->KVRR_GetStdDev().get<Array<Single>>();
+    initialised_ = true;
+    return kSuccess;
+  } catch (const Error&) {
+    return kCaughtError;
+  }
+}
+
+Integer KVTestRunSpreadTestData::KVRR_ReleaseSpreadTestData() {
+  white_samples_.reset();
+  blue_samples_.reset();
+  for (Array<Single>* table : {&average_, &lowest_, &highest_, &spread_, &std_dev_}) {
+    table->erase();
+  }
+  points_ = 0;
+  white_selected_ = false;
+  blue_selected_ = false;
+  initialised_ = false;
+  current_test_index_ = 0;
+  tolerance_.reset();
+  return kSuccess;
+}
+
+Integer KVTestRunSpreadTestData::KVRR_SetTolerance(const std::shared_ptr<IKVTolSet>& Tolerance) {
+  if (!Tolerance) raise(kObjectNotSet);
+  tolerance_ = Tolerance;
+  return kSuccess;
+}
+
+}  // namespace kvdata
