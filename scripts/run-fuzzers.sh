@@ -99,6 +99,7 @@ for target in "${targets[@]}"; do
 done
 
 if [ "${#failed[@]}" -gt 0 ]; then
+  echo >&2
   echo "findings in: ${failed[*]} (inputs and logs under $findings/)" >&2
   exit 1
 fi
