@@ -76,6 +76,7 @@ for target in "${targets[@]}"; do
     cp -R "fuzz/corpus/$target/." "$corpus/"
   fi
   log="$scratch/$target.log"
+  mkdir -p "$findings"
   rc=0
   "$bin" "${limits[@]}" "${budget[@]}" -artifact_prefix="$findings/$target-" "$corpus" \
     >"$log" 2>&1 || rc=$?
@@ -93,7 +94,7 @@ for target in "${targets[@]}"; do
   printf '%-28s %12s %8s %8s %8s  %s\n' "$target" "${execs:-?}" "${cov:-?}" "${ft:-?}" \
     "${corp:-?}" "$result"
   if [ "$rc" -ne 0 ]; then
-    cp "$log" "$findings/$target.log"
+    cp "$log" "$findings/$target.log" || true
     grep -E 'ERROR|fuzz check failed|SUMMARY|Test unit written' "$log" | head -20 | sed 's/^/    /'
   fi
 done
