@@ -97,7 +97,7 @@ std::vector<Byte> encoding(Object& object) {
 }
 
 ByteArray stream_of(const std::vector<Byte>& bytes, Long lower = 0) {
-  ByteArray s(lower, lower + static_cast<Long>(bytes.size()) - 1);
+  ByteArray s(lower, lower + (static_cast<Long>(bytes.size()) - 1));
   std::copy(bytes.begin(), bytes.end(), s.begin());
   return s;
 }
