@@ -2,6 +2,10 @@
 // the library lists them. Interface classes and facades are not creatable.
 #include "kvdata/automation/create_object.hpp"
 #include "kvdata/colour/ilu_d6510.hpp"
+#include "kvdata/objects/kv_cal_tile.hpp"
+#include "kvdata/objects/kv_calibration.hpp"
+#include "kvdata/objects/kv_tile.hpp"
+#include "kvdata/objects/kv_tile_set.hpp"
 #include "kvdata/objects/kv_tol_set.hpp"
 #include "kvdata/objects/kv_tolerance.hpp"
 #include "kvdata/objects/kv_user.hpp"
@@ -18,9 +22,13 @@ std::shared_ptr<Object> make() {
 
 constexpr CreatableClass kClasses[] = {
     {u"KVData.ILU_D6510", &make<ILU_D6510>},
+    {u"KVData.KVTile", &make<KVTile>},
+    {u"KVData.KVCalTile", &make<KVCalTile>},
     {u"KVData.KVUser", &make<KVUser>},
     {u"KVData.KVTolerance", &make<KVTolerance>},
     {u"KVData.KVTolSet", &make<KVTolSet>},
+    {u"KVData.KVCalibration", &make<KVCalibration>},
+    {u"KVData.KVTileSet", &make<KVTileSet>},
     {u"KVData.KVTestRunSpreadTestData", &make<KVTestRunSpreadTestData>},
     {u"KVData.Streams", &make<Streams>},
 };

@@ -41,6 +41,15 @@ inline String get_text_field(std::span<const Byte> image, std::size_t offset, st
   return trim_blanks(raw);
 }
 
+// The field's `units` code units as stored, blank padding and U+0000 units included.
+inline String get_raw_text_field(std::span<const Byte> image, std::size_t offset,
+                                 std::size_t units) {
+  String raw;
+  [[maybe_unused]] const bool inside = load_fixed_text(image, offset, units, raw);
+  assert(inside);
+  return raw;
+}
+
 // Stores the text cut to `units` code units or padded with blanks.
 inline void set_text_field(std::span<Byte> image, std::size_t offset, std::size_t units,
                            std::u16string_view text) {
