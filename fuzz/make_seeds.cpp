@@ -221,6 +221,38 @@ void object_seeds() {
   const auto set_bytes = object_stream(*set);
   seed("kv_tol_set_fuzz", "two_members", set_bytes);
 
+  auto tile = KVTile::create();
+  tile->ColorName(u"White");
+  tile->ColorRGB(0xF0F0F0);
+  tile->TempCompWL(1, 0.25);
+  tile->TempCompWL(40, -0.5);
+  seed("kv_tile_fuzz", "tile", object_stream(*tile));
+
+  auto tile_set = KVTileSet::create();
+  IKVTileSet& ts = *tile_set;
+  ts.TSN(u"TS01");
+  for (Integer i = 1; i <= 13; ++i) {
+    auto t = KVTile::create();
+    t->ColorName(u"Tile " + Variant(i).to_string());
+    t->ColorRGB(0x10101 * i);
+    t->TempCompWL(i, 0.125 * i);
+    ts.Tiles(i, t);
+  }
+  seed("kv_tile_set_fuzz", "thirteen_tiles", object_stream(*tile_set));
+
+  auto cal = KVCalibration::create();
+  IKVCalibration& c = *cal;
+  c.TSN(u"TS01");
+  c.DateCertified(Date{44500.0});
+  c.TempCalibrated(23.0f);
+  for (Integer i = 1; i <= 13; ++i) {
+    auto t = KVCalTile::create();
+    t->SCWL(eSC::SCE, 1, 10.0 * i);
+    t->SCWL(eSC::SCI, 40, 20.0 * i);
+    c.Tiles(i, t);
+  }
+  seed("kv_calibration_fuzz", "thirteen_tiles", object_stream(*cal));
+
   // Stream files hold raw streams, no shape byte.
   save("stream_load_fuzz", "tolerance_set", {}, set_bytes);
   save("stream_load_fuzz", "user", {}, user_bytes);
