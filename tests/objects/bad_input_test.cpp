@@ -19,13 +19,21 @@ namespace {
 using kvdata::Byte;
 using kvdata::ByteArray;
 using kvdata::Date;
+using kvdata::IKVCalibration;
+using kvdata::IKVTileSet;
 using kvdata::IKVTolerance;
 using kvdata::IKVTolSet;
+using kvdata::Integer;
+using kvdata::KVCalibration;
+using kvdata::KVCalTile;
+using kvdata::KVTile;
+using kvdata::KVTileSet;
 using kvdata::KVTolerance;
 using kvdata::KVTolSet;
 using kvdata::KVUser;
 using kvdata::Long;
 using kvdata::String;
+using kvdata::tTileSet;
 using kvdata::tUser;
 using kvdata::Variant;
 
@@ -395,6 +403,142 @@ TEST(ObjectBadInputText, FixedWidthTextCarriesAnyCodeUnitAndCutsByUnits) {
   auto user_back = KVUser::create();
   ASSERT_TRUE(user_back->StreamIn(us));
   EXPECT_EQ(user_back->v1User(), u);
+}
+
+// A tile set of 13 named tiles, TSN "TS01".
+std::shared_ptr<KVTileSet> tile_set() {
+  auto set = KVTileSet::create();
+  IKVTileSet& s = *set;
+  s.TSN(u"TS01");
+  for (Integer i = 1; i <= 13; ++i) {
+    auto tile = KVTile::create();
+    tile->ColorName(u"T" + Variant(i).to_string());
+    tile->ColorRGB(i);
+    s.Tiles(i, tile);
+  }
+  return set;
+}
+
+std::shared_ptr<KVCalibration> calibration() {
+  auto cal = KVCalibration::create();
+  IKVCalibration& c = *cal;
+  c.TSN(u"TS01");
+  c.DateCertified(Date{44500.0});
+  c.TempCalibrated(23.0f);
+  auto tile = KVCalTile::create();
+  tile->SCWL(kvdata::eSC::SCI, 40, 87.5);
+  c.Tiles(13, tile);
+  return cal;
+}
+
+TEST(ObjectBadInputTruncation, TileStreamsCutShort) {
+  LogCapture log;
+  // Tile and calibration blocks: every cut is refused, the object stays,
+  // and Position moves past the bytes there were.
+  const auto tile_bytes = encoding(*kvdata::query<kvdata::IKVStream>(tile_set()->Tiles(5)));
+  ASSERT_EQ(tile_bytes.size(), 264u);
+  for (std::size_t cut = 0; cut < tile_bytes.size(); ++cut) {
+    auto tile = KVTile::create();
+    tile->ColorName(u"OLD");
+    ByteArray s = stream_of(first(tile_bytes, cut));
+    Long p = 0;
+    EXPECT_FALSE(tile->StreamIn(s, p)) << cut;
+    EXPECT_EQ(p, static_cast<Long>(cut));
+    EXPECT_EQ(tile->ColorName(), u"OLD") << cut;
+  }
+  const auto cal_bytes = encoding(*calibration());
+  ASSERT_EQ(cal_bytes.size(), 4188u);
+  for (std::size_t cut = 0; cut < cal_bytes.size(); cut += 7) {
+    auto cal = KVCalibration::create();
+    cal->TSN(u"OLD");
+    ByteArray s = stream_of(first(cal_bytes, cut));
+    Long p = 0;
+    EXPECT_FALSE(cal->StreamIn(s, p)) << cut;
+    EXPECT_EQ(p, static_cast<Long>(cut));
+    EXPECT_EQ(cal->TSN(), u"OLD     ") << cut;
+    EXPECT_EQ(cal->Tiles(13)->SCWL(kvdata::eSC::SCI, 40), 0.0) << cut;
+  }
+
+  // Tile set: a cut inside the TSN field keeps the TSN (one entry, from the
+  // codec); a cut inside tile block t keeps tiles t to 13 and replaces the
+  // ones before it.
+  const auto set_bytes = encoding(*tile_set());
+  ASSERT_EQ(set_bytes.size(), 8u + 13u * 264u);
+  for (std::size_t cut = 0; cut < set_bytes.size(); cut += 5) {
+    log.entries.clear();
+    auto set = KVTileSet::create();
+    set->TSN(u"OLD");
+    ByteArray s = stream_of(first(set_bytes, cut));
+    Long p = 0;
+    EXPECT_FALSE(set->StreamIn(s, p)) << cut;
+    const tTileSet read = set->v1TileSet();
+    if (cut < 8) {
+      EXPECT_EQ(read.TSN, u"OLD") << cut;
+      EXPECT_EQ(log.entries.size(), 1u) << cut;
+      EXPECT_EQ(p, cut < 4 ? 0 : 4) << cut;
+      continue;
+    }
+    EXPECT_TRUE(log.entries.empty()) << cut;
+    EXPECT_EQ(p, static_cast<Long>(cut));
+    EXPECT_EQ(read.TSN, u"TS01");
+    const std::size_t whole = (cut - 8) / 264;
+    for (Long i = 1; i <= 13; ++i) {
+      EXPECT_EQ(read.Tiles(i).ColorRGB, static_cast<std::size_t>(i) <= whole ? i : 0)
+          << cut << " tile " << i;
+    }
+  }
+}
+
+TEST(ObjectBadInputPositions, TileReadersOutsideTheStreamKeepTheirState) {
+  LogCapture log;
+  const ByteArray tile_stream =
+      stream_of(encoding(*kvdata::query<kvdata::IKVStream>(tile_set()->Tiles(1))));
+  const ByteArray cal_stream = stream_of(encoding(*calibration()));
+  const ByteArray set_stream = stream_of(encoding(*tile_set()));
+  for (const Long position : {-1, -264, kLongMin, kLongMax - 100, kLongMax}) {
+    log.entries.clear();
+    auto tile = KVTile::create();
+    tile->ColorRGB(9);
+    Long p = position;
+    EXPECT_FALSE(tile->StreamIn(tile_stream, p)) << position;
+    EXPECT_EQ(p, position);
+    EXPECT_EQ(tile->ColorRGB(), 9);
+
+    auto cal = KVCalibration::create();
+    cal->TempCalibrated(9.0f);
+    p = position;
+    EXPECT_FALSE(cal->StreamIn(cal_stream, p)) << position;
+    EXPECT_EQ(p, position);
+    EXPECT_EQ(cal->TempCalibrated(), 9.0f);
+
+    // The tile set's TSN is a codec field: its one entry, nothing replaced.
+    auto set = tile_set();
+    set->TSN(u"OLD");
+    p = position;
+    EXPECT_FALSE(set->StreamIn(set_stream, p)) << position;
+    EXPECT_EQ(p, position);
+    EXPECT_EQ(set->TSN(), u"OLD");
+    EXPECT_EQ(log.entries.size(), 1u) << position;
+  }
+}
+
+TEST(ObjectBadInputText, TileSetSerialNumbersTravelAsWindows1252) {
+  // The tile set's TSN goes through the codec: characters Windows-1252
+  // lacks come back as '?'; tile names are fixed-width UTF-16 and come back
+  // as they were.
+  auto set = tile_set();
+  set->TSN(u"TS\u00E9\u65E5\U0001F600");
+  auto tile = KVTile::create();
+  tile->ColorName(u"\u65E5\xD800");
+  set->Tiles(2, tile);
+  ByteArray s(0, -1);
+  ASSERT_TRUE(set->StreamOut(s));
+  auto back = KVTileSet::create();
+  Long p = 0;
+  ASSERT_TRUE(back->StreamIn(s, p));
+  EXPECT_EQ(back->TSN(), u"TS\u00E9??");
+  EXPECT_EQ(back->Tiles(2)->ColorName(), u"\u65E5\xD800");
+  EXPECT_EQ(p, 4 + 5 + 13 * 264);
 }
 
 }  // namespace
