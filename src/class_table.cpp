@@ -4,6 +4,9 @@
 #include "kvdata/colour/ilu_d6510.hpp"
 #include "kvdata/objects/kv_cal_tile.hpp"
 #include "kvdata/objects/kv_calibration.hpp"
+#include "kvdata/objects/kv_profile.hpp"
+#include "kvdata/objects/kv_test_run.hpp"
+#include "kvdata/objects/kv_test_run_tiles_de.hpp"
 #include "kvdata/objects/kv_tile.hpp"
 #include "kvdata/objects/kv_tile_set.hpp"
 #include "kvdata/objects/kv_tol_set.hpp"
@@ -28,7 +31,10 @@ constexpr CreatableClass kClasses[] = {
     {u"KVData.KVTolerance", &make<KVTolerance>},
     {u"KVData.KVTolSet", &make<KVTolSet>},
     {u"KVData.KVCalibration", &make<KVCalibration>},
+    {u"KVData.KVTestRunTilesDE", &make<KVTestRunTilesDE>},
     {u"KVData.KVTileSet", &make<KVTileSet>},
+    {u"KVData.KVProfile", &make<KVProfile>},
+    {u"KVData.KVTestRun", &make<KVTestRun>},
     {u"KVData.KVTestRunSpreadTestData", &make<KVTestRunSpreadTestData>},
     {u"KVData.Streams", &make<Streams>},
 };

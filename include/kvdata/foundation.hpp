@@ -9,6 +9,7 @@
 #include "kvdata/foundation/ikv_db_object.hpp"
 #include "kvdata/foundation/ikv_obj.hpp"
 #include "kvdata/foundation/ikv_obj_creator.hpp"
+#include "kvdata/foundation/ikv_profile.hpp"
 #include "kvdata/foundation/ikv_security.hpp"
 #include "kvdata/foundation/ikv_stream.hpp"
 #include "kvdata/foundation/ikv_tile.hpp"

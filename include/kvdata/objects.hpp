@@ -1,9 +1,12 @@
 #pragma once
-// The domain objects: users, tolerances, tolerance sets, tiles, tile sets and
-// calibrations.
+// The domain objects: users, tolerances, tolerance sets, tiles, tile sets,
+// calibrations, profiles, test runs and test-run tile deltas.
 
 #include "kvdata/objects/kv_cal_tile.hpp"
 #include "kvdata/objects/kv_calibration.hpp"
+#include "kvdata/objects/kv_profile.hpp"
+#include "kvdata/objects/kv_test_run.hpp"
+#include "kvdata/objects/kv_test_run_tiles_de.hpp"
 #include "kvdata/objects/kv_tile.hpp"
 #include "kvdata/objects/kv_tile_set.hpp"
 #include "kvdata/objects/kv_tol_set.hpp"

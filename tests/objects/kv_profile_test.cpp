@@ -1,0 +1,447 @@
+#include "kvdata/objects/kv_profile.hpp"
+
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <cstddef>
+#include <initializer_list>
+#include <limits>
+#include <memory>
+#include <vector>
+
+#include "kvdata/kvdata.hpp"
+#include "objects/kv_profile_test_support.hpp"
+#include "support/error_number.hpp"
+
+namespace kvdata {
+namespace {
+
+using profile_testing::Bytes;
+using profile_testing::contents;
+using profile_testing::encoding;
+using profile_testing::LogCapture;
+using profile_testing::prefix;
+using profile_testing::stream_of;
+using profile_testing::Wire;
+using testing::error_number;
+
+constexpr Long kLongMax = std::numeric_limits<Long>::max();
+constexpr eSC kSCE = eSC::SCE;
+constexpr eSC kSCI = eSC::SCI;
+
+// The stream of a new profile, typed out from its layout: stamp 1.4, three
+// zero Longs, the record stream (empty ISN, zero date, False, the type name,
+// 320 zero table values), 80 zero band-width values.
+Bytes new_profile_stream() {
+  Wire w;
+  w.raw({0x33, 0x33, 0xB3, 0x3F}).zeros(12);
+  w.raw({0x00, 0x00, 0x00, 0x00}).zeros(8).raw({0x00});
+  w.raw({0x10, 0x00, 0x00, 0x00}).raw({'t', 'O', 'V', 'P', 'r', 'o', 'f', 'i'});
+  w.raw({'l', 'e', 'D', 'a', 't', 'a', 'V', '1'});
+  w.zeros(1280).zeros(320);
+  return w.bytes;
+}
+
+void patch(Bytes& bytes, std::size_t offset, std::initializer_list<int> values) {
+  for (int v : values) bytes.at(offset++) = static_cast<Byte>(v);
+}
+
+// Distinct, exactly representable values for every table entry.
+Single table_value(int table, Long sc, Long band) {
+  return static_cast<Single>(table * 1000 + sc * 100 + band) + 0.5f;
+}
+
+void fill(KVProfile& p, int base) {
+  for (Long k = 0; k <= 1; ++k) {
+    const auto sc = static_cast<eSC>(k);
+    for (Long band = 1; band <= 40; ++band) {
+      p.WhiteCorrection(sc, band, table_value(base + 1, k, band));
+      p.WaveCorrection(sc, band, table_value(base + 2, k, band));
+      p.LinearCorrection(sc, band, table_value(base + 3, k, band));
+      p.DarkCorrection(sc, band, table_value(base + 4, k, band));
+      p.BandWidthCorrection(sc, band, table_value(base + 5, k, band));
+    }
+  }
+}
+
+// The profile whose stream the reading tests decode: ISN "SN-7" puts the
+// record's date at 24, Validated at 32, the type name at 33..52, the tables
+// at 53..1332 and the band-width values at 1333..1652.
+std::shared_ptr<KVProfile> source_profile() {
+  auto p = KVProfile::create();
+  p->ISN(u"SN-7");
+  p->Created(Date{45000.5});
+  p->Validated(true);
+  p->StartWL(380);
+  p->EndWl(730);
+  p->Interval(10);
+  fill(*p, 0);
+  return p;
+}
+
+// The profile that the reading tests decode into, with other values everywhere.
+std::shared_ptr<KVProfile> old_profile() {
+  auto p = KVProfile::create();
+  p->ISN(u"OLD");
+  p->Created(Date{1.0});
+  p->Validated(false);
+  p->StartWL(1);
+  p->EndWl(2);
+  p->Interval(3);
+  fill(*p, 10);
+  return p;
+}
+
+bool tables_equal(const KVProfile& a, const KVProfile& b) {
+  for (Long k = 0; k <= 1; ++k) {
+    const auto sc = static_cast<eSC>(k);
+    for (Long band = 1; band <= 40; ++band) {
+      if (a.WhiteCorrection(sc, band) != b.WhiteCorrection(sc, band) ||
+          a.WaveCorrection(sc, band) != b.WaveCorrection(sc, band) ||
+          a.LinearCorrection(sc, band) != b.LinearCorrection(sc, band) ||
+          a.DarkCorrection(sc, band) != b.DarkCorrection(sc, band)) {
+        return false;
+      }
+    }
+  }
+  return true;
+}
+
+TEST(KVProfile, NewProfileStreamIsTheLiteral1649Bytes) {
+  auto p = KVProfile::create();
+  const Bytes expected = new_profile_stream();
+  ASSERT_EQ(expected.size(), 1649u);
+
+  ByteArray stream;  // never given bounds: the writer creates it from index 0
+  Long pos = 0;
+  EXPECT_TRUE(p->StreamOut(stream, pos));
+  EXPECT_EQ(pos, 1649);
+  EXPECT_EQ(stream.lbound(), 0);
+  EXPECT_EQ(stream.ubound(), 1649);  // one spare byte after the encoding
+  EXPECT_EQ(prefix(contents(stream), 1649), expected);
+  EXPECT_EQ(stream(1649), 0);
+  EXPECT_EQ(p->StreamLen(), 1649);
+}
+
+TEST(KVProfile, CorrectionsLandAtTheirPlacesAndComeBack) {
+  auto p = KVProfile::create();
+  p->WhiteCorrection(kSCI, 40, 2.5f);       // wCal(1) band 40: the 317th group of four
+  p->WaveCorrection(kSCE, 1, -1.0f);        // wave(0) band 1: second value of the tables
+  p->DarkCorrection(kSCE, 1, 0.25f);        // Dark(0) band 1: fourth value
+  p->BandWidthCorrection(kSCE, 1, 1.5f);    // first of the last 320 bytes
+  p->BandWidthCorrection(kSCI, 1, 3.0f);    // 160 bytes further on
+  p->BandWidthCorrection(kSCI, 40, -4.0f);  // the last four bytes
+
+  Bytes expected = new_profile_stream();
+  patch(expected, 1313, {0x00, 0x00, 0x20, 0x40});
+  patch(expected, 53, {0x00, 0x00, 0x80, 0xBF});
+  patch(expected, 61, {0x00, 0x00, 0x80, 0x3E});
+  patch(expected, 1329, {0x00, 0x00, 0xC0, 0x3F});
+  patch(expected, 1489, {0x00, 0x00, 0x40, 0x40});
+  patch(expected, 1645, {0x00, 0x00, 0x80, 0xC0});
+  EXPECT_EQ(encoding(*p), expected);
+
+  auto fresh = KVProfile::create();
+  Long pos = 0;
+  EXPECT_TRUE(fresh->StreamIn(stream_of(expected), pos));
+  EXPECT_EQ(pos, 1649);
+  EXPECT_EQ(fresh->WhiteCorrection(kSCI, 40), 2.5f);
+  EXPECT_EQ(fresh->WhiteCorrection(kSCE, 40), 0.0f);
+  EXPECT_EQ(fresh->WaveCorrection(kSCE, 1), -1.0f);
+  EXPECT_EQ(fresh->DarkCorrection(kSCE, 1), 0.25f);
+  EXPECT_EQ(fresh->BandWidthCorrection(kSCE, 1), 1.5f);
+  EXPECT_EQ(fresh->BandWidthCorrection(kSCI, 1), 3.0f);
+  EXPECT_EQ(fresh->BandWidthCorrection(kSCI, 40), -4.0f);
+}
+
+TEST(KVProfile, HeaderAndIdentityLiteralsAndRoundTrip) {
+  auto p = source_profile();
+  Wire w;
+  w.raw({0x33, 0x33, 0xB3, 0x3F}).raw({0x7C, 0x01, 0x00, 0x00}).raw({0xDA, 0x02, 0x00, 0x00});
+  w.raw({0x0A, 0x00, 0x00, 0x00}).raw({0x04, 0x00, 0x00, 0x00, 'S', 'N', '-', '7'});
+  w.raw({0x00, 0x00, 0x00, 0x00, 0x10, 0xF9, 0xE5, 0x40}).raw({0x01});
+  const Bytes written = encoding(*p);
+  ASSERT_EQ(written.size(), 1653u);
+  EXPECT_EQ(prefix(written, 33), w.bytes);
+
+  // Two profiles one after another in one array, the first after 7 bytes of
+  // the caller's own.
+  auto second = KVProfile::create();
+  second->ISN(u"B");
+  second->StartWL(-5);
+  ByteArray stream = stream_of({0xEE, 0xEE, 0xEE, 0xEE, 0xEE, 0xEE, 0xEE});
+  Long pos = 7;
+  EXPECT_TRUE(p->StreamOut(stream, pos));
+  EXPECT_EQ(pos, 7 + 1653);
+  EXPECT_TRUE(second->StreamOut(stream, pos));
+  EXPECT_EQ(pos, 7 + 1653 + 1650);
+  EXPECT_EQ(stream.ubound(), pos);
+  EXPECT_EQ(stream(6), 0xEE);
+
+  auto a = KVProfile::create();
+  auto b = KVProfile::create();
+  Long in = 7;
+  EXPECT_TRUE(a->StreamIn(stream, in));
+  EXPECT_EQ(in, 7 + 1653);
+  EXPECT_TRUE(b->StreamIn(stream, in));
+  EXPECT_EQ(in, pos);
+
+  EXPECT_EQ(a->ISN(), u"SN-7");
+  EXPECT_EQ(a->Created(), Date{45000.5});
+  EXPECT_TRUE(a->Validated());
+  EXPECT_EQ(a->StartWL(), 380);
+  EXPECT_EQ(a->EndWl(), 730);
+  EXPECT_EQ(a->Interval(), 10);
+  EXPECT_TRUE(tables_equal(*a, *p));
+  EXPECT_EQ(encoding(*a), written);
+  EXPECT_EQ(b->ISN(), u"B");
+  EXPECT_EQ(b->StartWL(), -5);
+
+  // Identity follows the decoded fields.
+  EXPECT_EQ(a->ID().type(), VarType::String);
+  EXPECT_EQ(a->ID().get<String>(), u"SN-7");
+  EXPECT_EQ(a->DateCreated().type(), VarType::Date);
+  EXPECT_EQ(a->DateCreated().get<Date>(), Date{45000.5});
+}
+
+TEST(KVProfile, CorrectionIndicesOutsideTheTablesRaiseError9AndChangeNothing) {
+  auto p = source_profile();
+  const Bytes before = encoding(*p);
+  const auto sc2 = static_cast<eSC>(2);
+  const auto sc_minus = static_cast<eSC>(-1);
+  EXPECT_EQ(error_number([&] { p->WaveCorrection(sc2, 1); }), kSubscriptOutOfRange);
+  EXPECT_EQ(error_number([&] { p->DarkCorrection(kSCE, 0); }), kSubscriptOutOfRange);
+  EXPECT_EQ(error_number([&] { p->WhiteCorrection(kSCI, 41, 1.0f); }), kSubscriptOutOfRange);
+  EXPECT_EQ(error_number([&] { p->LinearCorrection(sc_minus, 1, 1.0f); }), kSubscriptOutOfRange);
+  EXPECT_EQ(error_number([&] { p->BandWidthCorrection(kSCE, 0, 1.0f); }), kSubscriptOutOfRange);
+  EXPECT_EQ(error_number([&] { p->BandWidthCorrection(sc2, 40); }), kSubscriptOutOfRange);
+  EXPECT_EQ(error_number([&] { p->DarkCorrection(sc2, 40, 1.0f); }), kSubscriptOutOfRange);
+  EXPECT_EQ(encoding(*p), before);
+  EXPECT_EQ(p->LinearCorrection(kSCI, 40), table_value(3, 1, 40));
+}
+
+TEST(KVProfile, StreamInRefusesAnyStampButOnePointFour) {
+  LogCapture log;
+  Bytes bytes = encoding(*source_profile());
+  const std::vector<Bytes> stamps = {
+      {0x9A, 0x99, 0x99, 0x3F},  // 1.2
+      {0x34, 0x33, 0xB3, 0x3F},  // the Single next to 1.4
+      {0xCD, 0xCC, 0xCC, 0x3F},  // 1.6
+  };
+  for (const Bytes& stamp : stamps) {
+    std::copy(stamp.begin(), stamp.end(), bytes.begin());
+    auto p = old_profile();
+    const Bytes before = encoding(*p);
+    Long pos = 0;
+    EXPECT_FALSE(p->StreamIn(stream_of(bytes), pos));
+    EXPECT_EQ(pos, 4);
+    EXPECT_EQ(encoding(*p), before);
+  }
+  EXPECT_TRUE(log.entries.empty());
+}
+
+TEST(KVProfile, EveryTruncationGivesFalseWithWhatWasReadBeforeIt) {
+  const auto source = source_profile();
+  const Bytes full = encoding(*source);
+  ASSERT_EQ(full.size(), 1653u);
+  const auto old = old_profile();
+
+  for (std::size_t n = 0; n < full.size(); ++n) {
+    SCOPED_TRACE(n);
+    LogCapture log;
+    auto p = old_profile();
+    Long pos = 0;
+    ASSERT_FALSE(p->StreamIn(stream_of(prefix(full, n)), pos));
+    EXPECT_EQ(log.entries.size(), 1u);  // the one value that could not be read
+
+    EXPECT_EQ(p->StartWL(), n >= 8 ? 380 : 1);
+    EXPECT_EQ(p->EndWl(), n >= 12 ? 730 : 2);
+    EXPECT_EQ(p->Interval(), n >= 16 ? 10 : 3);
+    // A count that cannot be read yields the empty text; a body that cannot
+    // be read leaves the text as it was.
+    if (n < 16) {
+      EXPECT_EQ(p->ISN(), u"OLD");
+    } else if (n < 20) {
+      EXPECT_EQ(p->ISN(), u"");
+    } else if (n < 24) {
+      EXPECT_EQ(p->ISN(), u"OLD");
+    } else {
+      EXPECT_EQ(p->ISN(), u"SN-7");
+    }
+    EXPECT_EQ(p->Created(), n >= 32 ? Date{45000.5} : Date{1.0});
+    EXPECT_EQ(p->Validated(), n >= 33);
+    // Tables only from a whole record; no band-width value before that.
+    EXPECT_TRUE(tables_equal(*p, n >= 1333 ? *source : *old));
+    for (Long k = 0; k <= 1; ++k) {
+      for (Long band = 1; band <= 40; ++band) {
+        const auto sc = static_cast<eSC>(k);
+        const std::size_t end = 1333 + static_cast<std::size_t>((k * 40 + band) * 4);
+        const Single expected =
+            n >= end ? source->BandWidthCorrection(sc, band) : old->BandWidthCorrection(sc, band);
+        ASSERT_EQ(p->BandWidthCorrection(sc, band), expected) << k << " " << band;
+      }
+    }
+    // Position stops at the start of the value that could not be read.
+    Long stop = pos;
+    if (n < 4) {
+      stop = 0;
+    } else if (n < 8) {
+      stop = 4;
+    } else if (n >= 1333) {
+      stop = static_cast<Long>(1333 + (n - 1333) / 4 * 4);
+    }
+    EXPECT_EQ(pos, stop);
+  }
+}
+
+TEST(KVProfile, AnotherTypeNameStopsBeforeTheBandWidthValues) {
+  LogCapture log;
+  Bytes bytes = encoding(*source_profile());
+  patch(bytes, 52, {'2'});  // "tOVProfileDataV2"
+  auto p = old_profile();
+  const auto old = old_profile();
+  Long pos = 0;
+  EXPECT_FALSE(p->StreamIn(stream_of(bytes), pos));
+  EXPECT_EQ(pos, 53);
+  EXPECT_EQ(p->StartWL(), 380);
+  EXPECT_EQ(p->EndWl(), 730);
+  EXPECT_EQ(p->Interval(), 10);
+  EXPECT_EQ(p->ISN(), u"SN-7");
+  EXPECT_EQ(p->Created(), Date{45000.5});
+  EXPECT_TRUE(p->Validated());
+  EXPECT_TRUE(tables_equal(*p, *old));
+  EXPECT_EQ(p->BandWidthCorrection(kSCE, 1), old->BandWidthCorrection(kSCE, 1));
+  EXPECT_EQ(p->BandWidthCorrection(kSCI, 40), old->BandWidthCorrection(kSCI, 40));
+  EXPECT_TRUE(log.entries.empty());
+}
+
+TEST(KVProfile, StreamInIsSafeOnStreamsItCannotRead) {
+  LogCapture log;
+  const Bytes full = encoding(*source_profile());
+  auto p = old_profile();
+  const Bytes before = encoding(*p);
+  ByteArray unbounded;
+  Long pos = 0;
+  EXPECT_FALSE(p->StreamIn(unbounded, pos));
+  pos = -3;
+  EXPECT_FALSE(p->StreamIn(stream_of(full), pos));
+  EXPECT_EQ(pos, -3);
+  pos = kLongMax - 1;
+  EXPECT_FALSE(p->StreamIn(stream_of(full), pos));
+  EXPECT_EQ(pos, kLongMax - 1);
+  EXPECT_EQ(encoding(*p), before);
+
+  // A stream loaded from a file runs from index 1.
+  pos = 1;
+  EXPECT_TRUE(p->StreamIn(stream_of(full, 1), pos));
+  EXPECT_EQ(pos, 1 + 1653);
+  EXPECT_EQ(p->ISN(), u"SN-7");
+}
+
+TEST(KVProfile, StreamOutSizesTheArrayAndCutsItAtTheFinalPosition) {
+  const Bytes image = new_profile_stream();
+  auto p = KVProfile::create();
+
+  // Past the end of a short array: its bytes kept, the gap zero.
+  ByteArray shorter(0, 50);
+  for (Byte& b : shorter) b = 0xAA;
+  Long pos = 100;
+  EXPECT_TRUE(p->StreamOut(shorter, pos));
+  EXPECT_EQ(pos, 100 + 1649);
+  EXPECT_EQ(shorter.lbound(), 0);
+  EXPECT_EQ(shorter.ubound(), pos);
+  const Bytes got = contents(shorter);
+  EXPECT_EQ(Bytes(got.begin(), got.begin() + 51), Bytes(51, 0xAA));
+  EXPECT_EQ(Bytes(got.begin() + 51, got.begin() + 100), Bytes(49, 0));
+  EXPECT_EQ(Bytes(got.begin() + 100, got.begin() + 1749), image);
+
+  // A longer array is cut; its spare byte keeps what it held, as it is never written.
+  ByteArray longer(0, 9999);
+  for (Byte& b : longer) b = 0xAA;
+  pos = 10;
+  EXPECT_TRUE(p->StreamOut(longer, pos));
+  EXPECT_EQ(longer.ubound(), 10 + 1649);
+  EXPECT_EQ(longer(9), 0xAA);
+  EXPECT_EQ(longer(10), 0x33);
+  EXPECT_EQ(longer(10 + 1649), 0xAA);
+
+  // An array from a file (lower bound 1) comes back from index 0, its bytes kept by index.
+  ByteArray from_file = stream_of(Bytes(10, 0xAA), 1);
+  pos = 11;
+  EXPECT_TRUE(p->StreamOut(from_file, pos));
+  EXPECT_EQ(from_file.lbound(), 0);
+  EXPECT_EQ(from_file(0), 0);
+  EXPECT_EQ(from_file(10), 0xAA);
+  EXPECT_EQ(from_file(11), 0x33);
+
+  // An array never given bounds is created from index 0.
+  ByteArray unbounded;
+  pos = 5;
+  EXPECT_TRUE(p->StreamOut(unbounded, pos));
+  EXPECT_EQ(unbounded.lbound(), 0);
+  EXPECT_EQ(unbounded.ubound(), 5 + 1649);
+  EXPECT_EQ(unbounded(4), 0);
+  EXPECT_EQ(unbounded(5), 0x33);
+}
+
+TEST(KVProfile, StreamOutRefusesPositionsWithoutRoomAndChangesNothing) {
+  LogCapture log;
+  auto p = source_profile();
+  for (const Long start :
+       {Long{-1}, std::numeric_limits<Long>::min(), Long{kLongMax - 1999}, kLongMax}) {
+    SCOPED_TRACE(start);
+    ByteArray stream = stream_of({1, 2, 3});
+    Long pos = start;
+    EXPECT_FALSE(p->StreamOut(stream, pos));
+    EXPECT_EQ(pos, start);
+    EXPECT_EQ(contents(stream), (Bytes{1, 2, 3}));
+    EXPECT_EQ(stream.lbound(), 0);
+  }
+  EXPECT_TRUE(log.entries.empty());
+}
+
+TEST(KVProfile, StreamLenIsWhatStreamOutWrites) {
+  auto p = source_profile();
+  p->ISN(u"ABC\u20AC");  // the euro sign takes one byte
+  const Long len = p->StreamLen();
+  EXPECT_EQ(len, 1649 + 4);
+  ByteArray stream;
+  Long pos = 0;
+  EXPECT_TRUE(p->StreamOut(stream, pos));
+  EXPECT_EQ(pos, len);
+  EXPECT_EQ(stream.ubound(), len);
+  EXPECT_EQ(p->ISN(), u"ABC\u20AC");
+}
+
+TEST(KVProfile, IdentityValuesAndInterfaces) {
+  auto obj = CreateObject(u"KVData.KVProfile");
+  auto p = query<KVProfile>(obj);
+  ASSERT_NE(p, nullptr);
+  EXPECT_NE(query<IKVProfile>(obj), nullptr);
+  EXPECT_NE(query<IKVStream>(obj), nullptr);
+  EXPECT_NE(query<IKVObj>(obj), nullptr);
+  EXPECT_EQ(query<IKVDBObject>(obj), nullptr);
+  EXPECT_EQ(query<IKVSecurity>(obj), nullptr);
+
+  EXPECT_EQ(p->ObjType(), u"Profile");
+  EXPECT_EQ(p->Description(), u"Profile");
+  EXPECT_EQ(p->ID().type(), VarType::String);
+  EXPECT_EQ(p->ID().get<String>(), u"");
+  EXPECT_EQ(p->DateCreated().get<Date>(), Date{});
+  EXPECT_FALSE(p->Validated());
+  p->ISN(u"X9");
+  p->Created(Date{44000.75});
+  EXPECT_EQ(p->ID().get<String>(), u"X9");
+  EXPECT_EQ(p->DateCreated().get<Date>(), Date{44000.75});
+
+  // No relation between the wavelength Longs is required.
+  p->StartWL(730);
+  p->EndWl(380);
+  p->Interval(-10);
+  EXPECT_EQ(p->StartWL(), 730);
+  EXPECT_EQ(p->EndWl(), 380);
+  EXPECT_EQ(p->Interval(), -10);
+}
+
+}  // namespace
+}  // namespace kvdata
