@@ -253,6 +253,24 @@ void object_seeds() {
   }
   seed("kv_calibration_fuzz", "thirteen_tiles", object_stream(*cal));
 
+  auto prof = KVProfile::create();
+  IKVProfile& pr = *prof;
+  pr.ISN(u"ISN-0042");
+  pr.Created(Date{45000.25});
+  pr.Validated(true);
+  pr.StartWL(360);
+  pr.EndWl(750);
+  pr.Interval(10);
+  pr.WhiteCorrection(eSC::SCI, 40, 1.25f);
+  pr.DarkCorrection(eSC::SCE, 1, -0.5f);
+  pr.BandWidthCorrection(eSC::SCI, 20, 0.75f);
+  seed("kv_profile_fuzz", "profile", object_stream(*prof));
+
+  auto run = KVTestRun::create();
+  run->v1TestRun(test_run(true, 1));
+  run->LightLevelData(u"white 98.2; black 0.4");
+  seed("kv_test_run_fuzz", "two_series", object_stream(*run));
+
   // Stream files hold raw streams, no shape byte.
   save("stream_load_fuzz", "tolerance_set", {}, set_bytes);
   save("stream_load_fuzz", "user", {}, user_bytes);
