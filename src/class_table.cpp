@@ -2,6 +2,7 @@
 // the library lists them. Interface classes and facades are not creatable.
 #include "kvdata/automation/create_object.hpp"
 #include "kvdata/colour/ilu_d6510.hpp"
+#include "kvdata/objects/db_manager.hpp"
 #include "kvdata/objects/kv_cal_tile.hpp"
 #include "kvdata/objects/kv_calibration.hpp"
 #include "kvdata/objects/kv_profile.hpp"
@@ -34,6 +35,7 @@ constexpr CreatableClass kClasses[] = {
     {u"KVData.KVTestRunTilesDE", &make<KVTestRunTilesDE>},
     {u"KVData.KVTileSet", &make<KVTileSet>},
     {u"KVData.KVProfile", &make<KVProfile>},
+    {u"KVData.DBManager", &make<DBManager>},
     {u"KVData.KVTestRun", &make<KVTestRun>},
     {u"KVData.KVTestRunSpreadTestData", &make<KVTestRunSpreadTestData>},
     {u"KVData.Streams", &make<Streams>},

@@ -1,7 +1,9 @@
 #pragma once
 // The domain objects: users, tolerances, tolerance sets, tiles, tile sets,
-// calibrations, profiles, test runs and test-run tile deltas.
+// calibrations, profiles, test runs and test-run tile deltas; the root object
+// DBManager that creates them and hands out the data-access facades.
 
+#include "kvdata/objects/db_manager.hpp"
 #include "kvdata/objects/kv_cal_tile.hpp"
 #include "kvdata/objects/kv_calibration.hpp"
 #include "kvdata/objects/kv_profile.hpp"

@@ -1,0 +1,89 @@
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <memory>
+#include <string_view>
+#include <typeindex>
+#include <typeinfo>
+#include <vector>
+
+#include "kvdata/kvdata.hpp"
+#include "support/error_number.hpp"
+
+namespace kvdata {
+namespace {
+
+// Every class a client may create by name, with the class the name must give.
+struct Creatable {
+  std::u16string_view progid;
+  std::type_index type;
+};
+
+const Creatable kCreatable[] = {
+    {u"KVData.ILU_D6510", typeid(ILU_D6510)},
+    {u"KVData.KVTile", typeid(KVTile)},
+    {u"KVData.KVCalTile", typeid(KVCalTile)},
+    {u"KVData.KVUser", typeid(KVUser)},
+    {u"KVData.KVTolerance", typeid(KVTolerance)},
+    {u"KVData.KVTolSet", typeid(KVTolSet)},
+    {u"KVData.KVCalibration", typeid(KVCalibration)},
+    {u"KVData.KVTestRunTilesDE", typeid(KVTestRunTilesDE)},
+    {u"KVData.KVTileSet", typeid(KVTileSet)},
+    {u"KVData.KVProfile", typeid(KVProfile)},
+    {u"KVData.DBManager", typeid(DBManager)},
+    {u"KVData.KVTestRun", typeid(KVTestRun)},
+    {u"KVData.KVTestRunSpreadTestData", typeid(KVTestRunSpreadTestData)},
+    {u"KVData.Streams", typeid(Streams)},
+};
+
+void ExpectCannotCreate(std::u16string_view progid) {
+  EXPECT_EQ(testing::error_number([&] { (void)CreateObject(progid); }), kCannotCreateObject)
+      << to_utf8(progid);
+}
+
+TEST(ClassTable, ListsExactlyTheCreatableClasses) {
+  std::vector<String> listed;
+  for (const CreatableClass& c : CreatableClasses()) listed.emplace_back(c.progid);
+  std::vector<String> expected;
+  for (const Creatable& c : kCreatable) expected.emplace_back(c.progid);
+  std::sort(listed.begin(), listed.end());
+  std::sort(expected.begin(), expected.end());
+  EXPECT_EQ(listed, expected);
+}
+
+TEST(ClassTable, EachNameGivesANewObjectOfItsOwnClass) {
+  for (const Creatable& c : kCreatable) {
+    SCOPED_TRACE(to_utf8(c.progid));
+    std::shared_ptr<Object> a;
+    std::shared_ptr<Object> b;
+    const Long error = testing::error_number([&] {
+      a = CreateObject(c.progid);
+      b = CreateObject(to_upper(c.progid));  // names are compared without regard to case
+    });
+    ASSERT_EQ(error, 0);
+    ASSERT_NE(a, nullptr);
+    ASSERT_NE(b, nullptr);
+    EXPECT_NE(a, b);
+    EXPECT_EQ(std::type_index(typeid(*a)), c.type);
+    EXPECT_EQ(std::type_index(typeid(*b)), c.type);
+  }
+}
+
+TEST(ClassTable, InterfacesFacadesAndOtherNamesCannotBeCreated) {
+  for (std::u16string_view name :
+       {u"IKVObj",         u"IKVStream",  u"IKVDBObject",  u"IKVSecurity",   u"IKVObjCreator",
+        u"IKVTolerance",   u"IKVTolSet",  u"IKVTile",      u"IKVCalTile",    u"IKVTileSet",
+        u"IKVCalibration", u"IKVProfile", u"IIlluminant",  u"Organizations", u"Stations",
+        u"USers",          u"ServerDB",   u"CalStandards", u"TestRun1",      u"TestRun1Iterator",
+        u"Profiles",       u"_Streams"}) {
+    ExpectCannotCreate(String(u"KVData.") + String(name));
+  }
+  for (std::u16string_view progid :
+       {u"DBManager", u"KVData.", u"", u"KVData.DBManager ", u" KVData.DBManager",
+        u"KVData..DBManager", u"KVDataDBManager", u"Other.DBManager", u"KVData.KVTolSets"}) {
+    ExpectCannotCreate(progid);
+  }
+}
+
+}  // namespace
+}  // namespace kvdata
