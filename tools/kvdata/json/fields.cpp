@@ -44,7 +44,11 @@ void Fields::done() const {
 }
 
 std::string element(std::string_view path, long long index) {
-  return std::string(path) + "(" + std::to_string(index) + ")";
+  std::string s(path);
+  s += '(';
+  s += std::to_string(index);
+  s += ')';
+  return s;
 }
 
 String read_string(const Json& j, std::string_view path) {

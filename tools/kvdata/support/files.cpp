@@ -7,9 +7,7 @@
 #include <cerrno>
 #include <cstdio>
 #include <cstring>
-#include <fstream>
 #include <iostream>
-#include <iterator>
 
 #include "support/errors.hpp"
 
@@ -21,13 +19,32 @@ std::string reason(int err) {
 }
 
 std::string read_all(const std::string& path) {
+  const int fd = ::open(path.c_str(), O_RDONLY | O_CLOEXEC);
+  if (fd < 0) bad_input(path + ": cannot open: " + reason(errno));
   struct stat st {};
-  if (::stat(path.c_str(), &st) != 0) bad_input(path + ": cannot open: " + reason(errno));
-  if (S_ISDIR(st.st_mode)) bad_input(path + ": is a directory, not a file");
-  std::ifstream in(path, std::ios::binary);
-  if (!in) bad_input(path + ": cannot open: " + reason(errno));
-  std::string text((std::istreambuf_iterator<char>(in)), std::istreambuf_iterator<char>());
-  if (in.bad()) bad_input(path + ": read error");
+  if (::fstat(fd, &st) != 0) {
+    const int err = errno;
+    ::close(fd);
+    bad_input(path + ": cannot read: " + reason(err));
+  }
+  if (S_ISDIR(st.st_mode)) {
+    ::close(fd);
+    bad_input(path + ": is a directory, not a file");
+  }
+  std::string text;
+  char buf[1 << 16];
+  for (;;) {
+    const ssize_t n = ::read(fd, buf, sizeof buf);
+    if (n == 0) break;
+    if (n < 0) {
+      if (errno == EINTR) continue;
+      const int err = errno;
+      ::close(fd);
+      bad_input(path + ": read error: " + reason(err));
+    }
+    text.append(buf, static_cast<std::size_t>(n));
+  }
+  ::close(fd);
   return text;
 }
 

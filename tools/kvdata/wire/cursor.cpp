@@ -172,7 +172,11 @@ std::optional<String> Cursor::text_field(const std::string& name, std::size_t un
 
 bool Cursor::spectrum(const std::string& name) {
   for (int band = 1; band <= 40; ++band) {
-    if (!single_field(name + "(" + std::to_string(band) + ")")) return false;
+    std::string field = name;
+    field += '(';
+    field += std::to_string(band);
+    field += ')';
+    if (!single_field(field)) return false;
   }
   return true;
 }

@@ -7,8 +7,12 @@
 namespace kvdata::cli::layout {
 namespace {
 
+// "(i)", built by appending (GCC 12 warns falsely about "(" + text at -O3).
 std::string idx(long long i) {
-  return "(" + std::to_string(i) + ")";
+  std::string s(1, '(');
+  s += std::to_string(i);
+  s += ')';
+  return s;
 }
 
 const char* sc_name(int k) {

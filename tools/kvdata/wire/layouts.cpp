@@ -11,8 +11,12 @@ namespace {
 
 using namespace layout;
 
+// "(i)", built by appending (GCC 12 warns falsely about "(" + text at -O3).
 std::string idx(long long i) {
-  return "(" + std::to_string(i) + ")";
+  std::string s(1, '(');
+  s += std::to_string(i);
+  s += ')';
+  return s;
 }
 
 void set_evidence(Walk& w, Evidence e, std::string text) {
