@@ -29,7 +29,7 @@ cmake --preset release >/dev/null
 cmake --build --preset release -j2
 
 bench_bin=build/release/bench/kvdata_bench
-kvdata_bin=build/release/tools/kvdata/kvdata
+kvdata_bin=build/release/bin/kvdata
 
 load_before="$(cut -d' ' -f1-3 /proc/loadavg)"
 echo "== benchmark suite ($repetitions repetitions, load average $load_before)" >&2
