@@ -163,20 +163,21 @@ std::u16string_view Variant::record_type_name() const {
 }
 
 String Variant::to_string() const {
-  return std::visit(Overloaded{
-                        [](const std::monostate&) -> String { return {}; },
-                        [](const Null&) -> String { raise(kInvalidUseOfNull); },
-                        [](const Integer& v) -> String { return format_number(v, 15); },
-                        [](const Long& v) -> String { return format_number(v, 15); },
-                        [](const Single& v) -> String { return format_number(v, 7); },
-                        [](const Double& v) -> String { return format_number(v, 15); },
-                        [](const Date& v) -> String { return format_date(v); },
-                        [](const String& v) -> String { return v; },
-                        [](const bool& v) -> String { return v ? u"True" : u"False"; },
-                        [](const Byte& v) -> String { return format_number(v, 15); },
-                        [](const auto&) -> String { raise(kTypeMismatch); },
-                    },
-                    value_);
+  return std::visit(
+      Overloaded{
+          [](const std::monostate&) -> String { return {}; },
+          [](const Null&) -> String { raise(kInvalidUseOfNull); },
+          [](const Integer& v) -> String { return format_number(v, 15); },
+          [](const Long& v) -> String { return format_number(v, 15); },
+          [](const Single& v) -> String { return format_number(static_cast<Double>(v), 7); },
+          [](const Double& v) -> String { return format_number(v, 15); },
+          [](const Date& v) -> String { return format_date(v); },
+          [](const String& v) -> String { return v; },
+          [](const bool& v) -> String { return v ? u"True" : u"False"; },
+          [](const Byte& v) -> String { return format_number(v, 15); },
+          [](const auto&) -> String { raise(kTypeMismatch); },
+      },
+      value_);
 }
 
 Double Variant::to_double() const {
@@ -185,7 +186,7 @@ Double Variant::to_double() const {
                         [](const Null&) -> Double { raise(kInvalidUseOfNull); },
                         [](const Integer& v) -> Double { return v; },
                         [](const Long& v) -> Double { return v; },
-                        [](const Single& v) -> Double { return v; },
+                        [](const Single& v) -> Double { return static_cast<Double>(v); },
                         [](const Double& v) -> Double { return v; },
                         [](const Date& v) -> Double { return v.days; },
                         [](const String& v) -> Double { return parse_number(v); },

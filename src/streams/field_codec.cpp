@@ -5,6 +5,8 @@
 #include "kvdata/streams/field_codec.hpp"
 
 #include <new>
+#include <optional>
+#include <span>
 #include <stdexcept>
 #include <string_view>
 #include <utility>
@@ -18,6 +20,9 @@
 #include "streams/detail/little_endian.hpp"
 
 namespace kvdata {
+
+using namespace std::string_view_literals;
+
 namespace {
 
 using detail::kLongMax;
@@ -110,10 +115,12 @@ void grow_to_hold(ByteArray& stream, Long position, Long width) {
   if (stream.ubound() < last) stream.redim_preserve(stream.lbound(), last);
 }
 
-// Fixed-width writer: `wire` is the value's image type, `shown` what the
-// entry renders as Value.
+// Fixed-width writer, the path that grows the array or fails: `wire` is the
+// value's image type, `shown` what the entry renders as Value. Kept out of
+// line so that the short path below carries none of its set-up.
 template <class T, class Shown>
-bool write_fixed(std::u16string_view op, T wire, Shown shown, ByteArray& stream, Long& position) {
+[[gnu::noinline]] bool write_fixed_growing(std::u16string_view op, T wire, Shown shown,
+                                           ByteArray& stream, Long& position) {
   return trap(
       [&] {
         constexpr Long width = static_cast<Long>(kWireWidth<T>);
@@ -125,9 +132,33 @@ bool write_fixed(std::u16string_view op, T wire, Shown shown, ByteArray& stream,
       [&](const Error& e) { return common_text(op, Variant(shown).to_string(), e); });
 }
 
-// Fixed-width reader: Value and Position change only once all bytes are in.
+// Fixed-width writer. Two short paths cover nearly every write, and nothing
+// can fail on them: an array that already holds every byte of the value (a
+// pre-sized stream), and an array whose spare elements take the growth (a
+// stream written value by value). Either way the array ends up as the
+// growing path would leave it.
+template <class T, class Shown>
+bool write_fixed(std::u16string_view op, T wire, Shown shown, ByteArray& stream, Long& position) {
+  constexpr Long width = static_cast<Long>(kWireWidth<T>);
+  if (position <= kLongMax - width && stream.rank() == 1) {
+    auto bytes = detail::window(stream, position, kWireWidth<T>);
+    if (!bytes && position >= stream.lbound() && stream.try_extend(position + width - 1)) {
+      bytes = detail::window(stream, position, kWireWidth<T>);
+    }
+    if (bytes) {
+      static_cast<void>(detail::store_le(*bytes, 0, wire));
+      position += width;
+      return true;
+    }
+  }
+  return write_fixed_growing(op, wire, shown, stream, position);
+}
+
+// Fixed-width reader, the path that fails. Value and Position change only
+// once all bytes are in.
 template <class T>
-bool read_fixed(std::u16string_view op, const ByteArray& stream, Long& position, T& value) {
+[[gnu::noinline]] bool read_fixed_failing(std::u16string_view op, const ByteArray& stream,
+                                          Long& position, T& value) {
   return trap(
       [&] {
         constexpr Long width = static_cast<Long>(kWireWidth<T>);
@@ -142,43 +173,89 @@ bool read_fixed(std::u16string_view op, const ByteArray& stream, Long& position,
       [&](const Error& e) { return common_text(op, Variant(T{}).to_string(), e); });
 }
 
+// Fixed-width reader. Bytes that lie inside the array take the short path.
+template <class T>
+bool read_fixed(std::u16string_view op, const ByteArray& stream, Long& position, T& value) {
+  constexpr Long width = static_cast<Long>(kWireWidth<T>);
+  if (position <= kLongMax - width) {
+    if (const auto bytes = detail::window(stream, position, kWireWidth<T>)) {
+      static_cast<void>(detail::load_le(*bytes, 0, value));
+      position += width;
+      return true;
+    }
+  }
+  return read_fixed_failing(op, stream, position, value);
+}
+
 }  // namespace
 
 namespace checked {
 
+std::optional<std::span<Byte>> reserve_run(ByteArray& stream, Long position,
+                                           std::size_t n) noexcept {
+  if (n == 0 || n > static_cast<std::size_t>(kLongMax)) return std::nullopt;
+  const auto width = static_cast<Long>(n);
+  if (stream.rank() != 1 || position < stream.lbound() || position > kLongMax - width) {
+    return std::nullopt;
+  }
+  const Long last = position + width - 1;
+  if (stream.ubound() < last && !stream.try_extend(last)) {
+    try {
+      stream.redim_preserve(stream.lbound(), last);
+    } catch (...) {
+      return std::nullopt;  // unchanged: the values one by one will log the failure
+    }
+  }
+  return detail::window(stream, position, n);
+}
+
+std::optional<std::span<const Byte>> peek_run(const ByteArray& stream, Long position,
+                                              std::size_t n) noexcept {
+  if (n == 0 || n > static_cast<std::size_t>(kLongMax)) return std::nullopt;
+  if (position > kLongMax - static_cast<Long>(n)) return std::nullopt;
+  return detail::window(stream, position, n);
+}
+
 bool write_integer(Integer value, ByteArray& stream, Long& position) {
-  return write_fixed(u"IntegerToArray", value, value, stream, position);
+  return write_fixed(u"IntegerToArray"sv, value, value, stream, position);
 }
 bool read_integer(const ByteArray& stream, Long& position, Integer& value) {
-  return read_fixed(u"IntegerFromArray", stream, position, value);
+  return read_fixed(u"IntegerFromArray"sv, stream, position, value);
 }
 
 bool write_long(Long value, ByteArray& stream, Long& position) {
-  return write_fixed(u"LongToArray", value, value, stream, position);
+  return write_fixed(u"LongToArray"sv, value, value, stream, position);
 }
 bool read_long(const ByteArray& stream, Long& position, Long& value) {
-  return read_fixed(u"LongFromArray", stream, position, value);
+  return read_fixed(u"LongFromArray"sv, stream, position, value);
 }
 
 bool write_single(Single value, ByteArray& stream, Long& position) {
-  return write_fixed(u"SingleToArray", value, value, stream, position);
+  return write_fixed(u"SingleToArray"sv, value, value, stream, position);
 }
 bool read_single(const ByteArray& stream, Long& position, Single& value) {
-  return read_fixed(u"SingleFromArray", stream, position, value);
+  return read_fixed(u"SingleFromArray"sv, stream, position, value);
 }
 
 bool write_date(Date value, ByteArray& stream, Long& position) {
-  return write_fixed(u"DateToArray", value, value, stream, position);
+  return write_fixed(u"DateToArray"sv, value, value, stream, position);
 }
 bool read_date(const ByteArray& stream, Long& position, Date& value) {
-  return read_fixed(u"DateFromArray", stream, position, value);
+  return read_fixed(u"DateFromArray"sv, stream, position, value);
 }
 
 bool write_boolean(bool value, ByteArray& stream, Long& position) {
-  return write_fixed(u"BooleanToArray", Byte{value ? Byte{1} : Byte{0}}, value, stream, position);
+  return write_fixed(u"BooleanToArray"sv, Byte{value ? Byte{1} : Byte{0}}, value, stream, position);
 }
 
 bool read_boolean(const ByteArray& stream, Long& position, bool& value) {
+  if (position < kLongMax) {
+    if (const auto byte = detail::window(stream, position, 1)) {
+      value = (*byte)[0] == 1;
+      ++position;
+      return true;
+    }
+  }
   return trap(
       [&] {
         Byte read = 0;
@@ -222,7 +299,7 @@ bool write_string(const String& value, ByteArray& stream, Long& position) {
       [&](const Error& e) {
         String text(trace);
         text += kLineBreak;
-        text += common_text(u"StringToArray", value, e);
+        text += common_text(u"StringToArray"sv, value, e);
         return text;
       });
 }

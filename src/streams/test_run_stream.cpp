@@ -37,20 +37,16 @@ void get_stats(FieldReader& in, tTestStats& stats) {
 
 // Per geometry and band, the trial value and the profiled value side by side.
 void put_iia_tile(FieldWriter& out, const tIIATile& tile) {
+  FieldWriter::Run values = out.run(kIiaTileBytes);
   for (Long k = 0; k <= 1; ++k) {
-    for (Long band = 1; band <= kBandCount; ++band) {
-      out.put_single(tile.Trial.Spectrum(k).Data(band))
-          .put_single(tile.TrialProfiled.Spectrum(k).Data(band));
-    }
+    values.put_interleaved(tile.Trial.Spectrum(k).Data, tile.TrialProfiled.Spectrum(k).Data);
   }
 }
 
 void get_iia_tile(FieldReader& in, tIIATile& tile) {
+  FieldReader::Run values = in.run(kIiaTileBytes);
   for (Long k = 0; k <= 1; ++k) {
-    for (Long band = 1; band <= kBandCount; ++band) {
-      in.get_single(tile.Trial.Spectrum(k).Data(band))
-          .get_single(tile.TrialProfiled.Spectrum(k).Data(band));
-    }
+    values.get_interleaved(tile.Trial.Spectrum(k).Data, tile.TrialProfiled.Spectrum(k).Data);
   }
 }
 

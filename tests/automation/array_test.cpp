@@ -2,6 +2,9 @@
 
 #include <gtest/gtest.h>
 
+#include <iterator>
+#include <utility>
+
 #include "support/error_number.hpp"
 
 #include "kvdata/foundation/enums.hpp"
@@ -107,6 +110,49 @@ TEST(Array, GrowingOneElementAtATimeReallocatesOnlyLogarithmicallyOften) {
   EXPECT_EQ(a(999'999), static_cast<Byte>(999'999));
 }
 
+TEST(Array, SpareElementsStayOutsideTheBoundsAndComeBackZero) {
+  ByteArray grown(0, -1);
+  for (Long i = 0; i <= 4; ++i) {
+    grown.redim_preserve(0, i);
+    grown(i) = static_cast<Byte>(10 + i);
+  }
+  // Iteration, size and comparison see the bounds only, never the spare room.
+  EXPECT_EQ(grown.size(), 5u);
+  EXPECT_EQ(std::distance(grown.begin(), grown.end()), 5);
+  ByteArray exact(0, 4);
+  for (Long i = 0; i <= 4; ++i) exact(i) = static_cast<Byte>(10 + i);
+  EXPECT_TRUE(grown == exact);
+  EXPECT_EQ(error_number([&] { (void)grown(5); }), kSubscriptOutOfRange);
+
+  // A cut followed by growth into the room it left finds zeros, whether the
+  // growth goes through redim_preserve or try_extend.
+  grown.redim_preserve(0, 1);
+  EXPECT_TRUE(grown.try_extend(3));
+  EXPECT_EQ(grown.ubound(), 3);
+  EXPECT_EQ(grown(1), 11);
+  EXPECT_EQ(grown(2), 0);
+  EXPECT_EQ(grown(3), 0);
+  grown.redim_preserve(0, 4);
+  EXPECT_EQ(grown(4), 0);
+
+  // try_extend never shrinks, never changes another rank and never gives
+  // bounds to an array without them.
+  EXPECT_FALSE(grown.try_extend(2));
+  EXPECT_EQ(grown.ubound(), 4);
+  Array<Single> table({{1, 2}, {1, 3}});
+  EXPECT_FALSE(table.try_extend(5));
+  EXPECT_EQ(table.rank(), 2);
+  ByteArray none;
+  EXPECT_FALSE(none.try_extend(0));
+  EXPECT_EQ(none.rank(), 0);
+
+  Array<String> texts(1, 3);
+  texts(3) = u"gone";
+  texts.redim_preserve(1, 2);
+  EXPECT_TRUE(texts.try_extend(3));
+  EXPECT_EQ(texts(3), u"");
+}
+
 TEST(Array, CopiesAreIndependentValues) {
   Array<String> a(0, 1);
   a(0) = u"x";
@@ -114,6 +160,11 @@ TEST(Array, CopiesAreIndependentValues) {
   b(0) = u"y";
   EXPECT_EQ(a(0), u"x");
   EXPECT_FALSE(a == b);
+
+  Array<String> moved = std::move(b);
+  EXPECT_EQ(moved(0), u"y");
+  EXPECT_EQ(b.rank(), 0);  // NOLINT(bugprone-use-after-move): the source is left without bounds
+  EXPECT_EQ(b.size(), 0u);
 }
 
 TEST(FixedArray, CheckedAccessAcceptsEnumerations) {

@@ -1,6 +1,7 @@
 #include <gtest/gtest.h>
 
 #include <array>
+#include <cstdint>
 #include <span>
 #include <vector>
 
@@ -32,6 +33,53 @@ TEST(ByteLayout, ScalarsAreLittleEndianAndBoundsChecked) {
   l = 5;
   EXPECT_FALSE(detail::load_le(std::span<const Byte>(buf), 6, l));
   EXPECT_EQ(l, 5);
+}
+
+TEST(ByteLayout, RunsOfSinglesAreTheirImagesInOrderWithOneCheck) {
+  // 1.0f = 00 00 80 3F, -2.0f = 00 00 00 C0, 0.5f = 00 00 00 3F, 3.0f = 00 00 40 40.
+  const std::array<Single, 2> a{1.0f, -2.0f};
+  const std::array<Single, 2> b{0.5f, 3.0f};
+  std::array<Byte, 18> buf{};
+  buf.fill(0xEE);
+  const std::span<Byte> out(buf);
+  EXPECT_TRUE(
+      detail::store_le_interleaved(out, 1, std::span<const Single>(a), std::span<const Single>(b)));
+  EXPECT_EQ(Bytes(buf.begin(), buf.end()),
+            (Bytes{0xEE, 0x00, 0x00, 0x80, 0x3F, 0x00, 0x00, 0x00, 0x3F, 0x00, 0x00, 0x00, 0xC0,
+                   0x00, 0x00, 0x40, 0x40, 0xEE}));
+  std::array<Byte, 10> flat{};
+  flat.fill(0xEE);
+  EXPECT_TRUE(detail::store_le_run(std::span<Byte>(flat), 1, std::span<const Single>(b)));
+  EXPECT_EQ(Bytes(flat.begin(), flat.end()),
+            (Bytes{0xEE, 0x00, 0x00, 0x00, 0x3F, 0x00, 0x00, 0x40, 0x40, 0xEE}));
+
+  // A run that would end past the buffer, or halves of different lengths,
+  // write nothing.
+  const std::array<Byte, 18> before = buf;
+  EXPECT_FALSE(detail::store_le_run(out, 11, std::span<const Single>(b)));
+  EXPECT_FALSE(
+      detail::store_le_interleaved(out, 3, std::span<const Single>(a), std::span<const Single>(b)));
+  EXPECT_FALSE(detail::store_le_interleaved(out, 0, std::span<const Single>(a),
+                                            std::span<const Single>(b).first(1)));
+  EXPECT_FALSE(detail::store_le_run(out, SIZE_MAX, std::span<const Single>(b)));
+  EXPECT_EQ(buf, before);
+
+  std::array<Single, 2> a_in{7.0f, 7.0f};
+  std::array<Single, 2> b_in{7.0f, 7.0f};
+  const std::span<const Byte> in(buf);
+  EXPECT_TRUE(detail::load_le_interleaved(in, 1, std::span<Single>(a_in), std::span<Single>(b_in)));
+  EXPECT_EQ(a_in, a);
+  EXPECT_EQ(b_in, b);
+  std::array<Single, 2> run_in{};
+  EXPECT_TRUE(detail::load_le_run(std::span<const Byte>(flat), 1, std::span<Single>(run_in)));
+  EXPECT_EQ(run_in, b);
+  const std::array<Single, 2> kept = run_in;
+  EXPECT_FALSE(detail::load_le_run(std::span<const Byte>(flat), 3, std::span<Single>(run_in)));
+  EXPECT_FALSE(
+      detail::load_le_interleaved(in, 3, std::span<Single>(a_in), std::span<Single>(b_in)));
+  EXPECT_EQ(run_in, kept);  // untouched by the refusals
+  EXPECT_EQ(a_in, a);
+  EXPECT_EQ(b_in, b);
 }
 
 TEST(ByteLayout, StreamPositionsIndexTheArrayWhateverItsLowerBound) {

@@ -81,6 +81,45 @@ TEST(Streams, SCPairIsEightySinglesSCEFirst) {
   EXPECT_EQ(pos, 320);
 }
 
+TEST(Streams, SCPairWriterGrowsTheStreamAsItsValuesOneByOneWould) {
+  LogCapture log;
+  const tSCPair pair = sc_pair(3);
+  Wire expected;
+  put(expected, pair);
+
+  // A loaded stream (lower bound 1) written past its end: it grows to end
+  // exactly at the last value, lower bound kept, the gap zero.
+  ByteArray loaded = stream_of({0xAA, 0xBB}, 1);
+  Long pos = 5;
+  tSCPair copy = pair;
+  ASSERT_TRUE(streams().Stream_SCPair(kTo, loaded, pos, copy));
+  EXPECT_EQ(pos, 325);
+  EXPECT_EQ(loaded.lbound(), 1);
+  EXPECT_EQ(loaded.ubound(), 324);
+  Bytes want{0xAA, 0xBB, 0x00, 0x00};
+  want.insert(want.end(), expected.bytes.begin(), expected.bytes.end());
+  EXPECT_EQ(contents(loaded), want);
+
+  // A longer stream keeps its length and the bytes after the pair.
+  ByteArray longer = stream_of(Bytes(400, 0x11));
+  pos = 0;
+  ASSERT_TRUE(streams().Stream_SCPair(kTo, longer, pos, copy));
+  EXPECT_EQ(longer.ubound(), 399);
+  EXPECT_EQ(Bytes(longer.begin(), longer.begin() + 320), expected.bytes);
+  EXPECT_EQ(longer(320), 0x11);
+  EXPECT_TRUE(log.entries.empty());
+
+  // A Position below the lower bound: the first value fails, logs its one
+  // entry, and nothing is written.
+  pos = 0;
+  EXPECT_FALSE(streams().Stream_SCPair(kTo, loaded, pos, copy));
+  EXPECT_EQ(pos, 0);
+  EXPECT_EQ(contents(loaded), want);
+  ASSERT_EQ(log.entries.size(), 1u);
+  EXPECT_EQ(log.entries[0].rfind(u"Error in SUB SingleToArray - Value = 3.25. 9-", 0), 0u)
+      << to_utf8(log.entries[0]);
+}
+
 TEST(Streams, SCPairReaderStopsAtTheFirstMissingValue) {
   LogCapture log;
   Wire w;

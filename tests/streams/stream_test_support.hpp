@@ -76,9 +76,10 @@ inline std::vector<Byte> contents(const ByteArray& stream) {
   return std::vector<Byte>(stream.begin(), stream.end());
 }
 
-// A stream with lower bound `lower` holding `bytes`.
+// A stream with lower bound `lower` holding `bytes` (its upper bound may be
+// the highest Long).
 inline ByteArray stream_of(const std::vector<Byte>& bytes, Long lower = 0) {
-  ByteArray stream(lower, lower + static_cast<Long>(bytes.size()) - 1);
+  ByteArray stream(lower, lower + (static_cast<Long>(bytes.size()) - 1));
   std::copy(bytes.begin(), bytes.end(), stream.begin());
   return stream;
 }

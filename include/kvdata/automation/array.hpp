@@ -31,9 +31,11 @@ struct Bounds {
 // A dynamic array with zero, one or two dimensions. An array without
 // dimensions (rank 0) was never given bounds: asking it for bounds or
 // elements raises error 9. Elements are value-initialised. Two-dimensional
-// arrays keep the first index fastest in memory. Growth keeps spare capacity
-// (geometric), so growing an array one element at a time is amortised linear
-// while the bounds stay exact.
+// arrays keep the first index fastest in memory. Growth keeps spare,
+// value-initialised elements beyond the upper bound (geometric), so growing
+// an array one element at a time is amortised linear, and a growth that fits
+// in the spare elements is a change of the bound alone, while the bounds
+// stay exact. Copies hold no spare elements.
 template <class T>
 class Array {
   static_assert(!std::is_same_v<T, bool>, "use Array<Integer> or Array<Byte> for flags");
@@ -45,6 +47,40 @@ class Array {
 
   Array() = default;
   Array(Long lower, Long upper) { redim(lower, upper); }
+  Array(const Array& other)
+      : items_(other.begin(), other.end()),
+        size_(other.size_),
+        dims_(other.dims_),
+        rank_(other.rank_) {}
+  // The source is left without bounds.
+  Array(Array&& other) noexcept
+      : items_(std::move(other.items_)),
+        size_(other.size_),
+        dims_(other.dims_),
+        rank_(other.rank_) {
+    other.forget();
+  }
+  Array& operator=(const Array& other) {
+    if (this != &other) {
+      items_.assign(other.begin(), other.end());
+      size_ = other.size_;
+      dims_ = other.dims_;
+      rank_ = other.rank_;
+    }
+    return *this;
+  }
+  // The source is left without bounds.
+  Array& operator=(Array&& other) noexcept {
+    if (this != &other) {
+      items_ = std::move(other.items_);
+      size_ = other.size_;
+      dims_ = other.dims_;
+      rank_ = other.rank_;
+      other.forget();
+    }
+    return *this;
+  }
+  ~Array() = default;
   // One or two dimensions: Array({{1, 2}, {1, 40}}).
   Array(std::initializer_list<Bounds> dims) {
     if (dims.size() == 1) {
@@ -63,14 +99,14 @@ class Array {
   Long lbound(int dim = 1) const { return dimension(dim).lower; }
   Long ubound(int dim = 1) const { return dimension(dim).upper; }
 
-  std::size_t size() const { return items_.size(); }
-  bool empty() const { return items_.empty(); }
+  std::size_t size() const { return size_; }
+  bool empty() const { return size_ == 0; }
   T* data() { return items_.data(); }
   const T* data() const { return items_.data(); }
   iterator begin() { return items_.begin(); }
-  iterator end() { return items_.end(); }
+  iterator end() { return items_.begin() + static_cast<std::ptrdiff_t>(size_); }
   const_iterator begin() const { return items_.begin(); }
-  const_iterator end() const { return items_.end(); }
+  const_iterator end() const { return items_.begin() + static_cast<std::ptrdiff_t>(size_); }
 
   // True when the array is one-dimensional and `i` lies within its bounds.
   bool contains(Long i) const { return rank_ == 1 && i >= dims_[0].lower && i <= dims_[0].upper; }
@@ -89,6 +125,7 @@ class Array {
     std::vector<T> fresh;
     allocate(fresh, n);
     items_ = std::move(fresh);
+    size_ = n;
     dims_ = {Bounds{lower, upper}, Bounds{}};
     rank_ = 1;
   }
@@ -99,52 +136,45 @@ class Array {
     std::vector<T> fresh;
     allocate(fresh, n1 * n2);
     items_ = std::move(fresh);
+    size_ = n1 * n2;
     dims_ = {first, second};
     rank_ = 2;
   }
 
   // New one-dimensional bounds keeping the elements whose indices stay inside
-  // them; new elements are value-initialised. An array without bounds gets them.
+  // them; new elements are value-initialised. An array without bounds gets
+  // them. On failure (error 9 or 7) the array is unchanged.
   void redim_preserve(Long lower, Long upper) {
-    const std::size_t n = count(Bounds{lower, upper});
-    if (rank_ == 1 && lower == dims_[0].lower) {
-      // Same lower bound: resize in place; std::vector grows geometrically.
-      try {
-        items_.resize(n);
-      } catch (const std::bad_alloc&) {
-        raise(kOutOfMemory);
-      } catch (const std::length_error&) {
-        raise(kOutOfMemory);
-      }
-      dims_[0].upper = upper;
-      return;
-    }
-    std::vector<T> fresh;
-    allocate(fresh, n);
-    if (rank_ == 1) {
-      const Long from = std::max(lower, dims_[0].lower);
-      const Long to = std::min(upper, dims_[0].upper);
-      for (Long i = from; i <= to && from <= to; ++i) {
-        fresh[static_cast<std::size_t>(static_cast<long long>(i) - lower)] =
-            std::move(items_[static_cast<std::size_t>(static_cast<long long>(i) - dims_[0].lower)]);
-      }
-    } else if (rank_ == 2) {
-      raise(kSubscriptOutOfRange);
-    }
-    items_ = std::move(fresh);
-    dims_ = {Bounds{lower, upper}, Bounds{}};
-    rank_ = 1;
+    if (rank_ == 1 && lower == dims_[0].lower && try_extend(upper)) return;
+    redim_preserve_elsewhere(lower, upper);
   }
 
-  // Reserves capacity for `n` elements without changing the bounds.
-  void reserve(std::size_t n) { items_.reserve(n); }
+  // Growth of a one-dimensional array into its spare elements, the step of
+  // every writer that appends to a stream: moves the upper bound up to
+  // `upper` and returns true when the spare elements take the new ones, as
+  // redim_preserve(lbound(), upper) would; otherwise (another rank, an upper
+  // bound below the current one, not enough spare elements) returns false
+  // and changes nothing.
+  bool try_extend(Long upper) noexcept {
+    if (rank_ != 1 || upper < dims_[0].upper) return false;
+    const auto n = static_cast<std::size_t>(static_cast<long long>(upper) - dims_[0].lower + 1);
+    if (n > items_.size()) return false;
+    size_ = n;
+    dims_[0].upper = upper;
+    return true;
+  }
+
+  // Makes room for `n` elements without changing the bounds: a later growth
+  // up to `n` elements moves the bound alone. No memory raises error 7.
+  void reserve(std::size_t n) {
+    if (n > items_.size()) allocate(items_, n);
+  }
 
   // Removes the bounds: the array has no dimensions afterwards.
   void erase() {
     items_.clear();
     items_.shrink_to_fit();
-    dims_ = {Bounds{}, Bounds{}};
-    rank_ = 0;
+    forget();
   }
 
   friend bool operator==(const Array& a, const Array& b) {
@@ -153,11 +183,53 @@ class Array {
       if (!(a.dims_[static_cast<std::size_t>(d)] == b.dims_[static_cast<std::size_t>(d)]))
         return false;
     }
-    return a.items_ == b.items_;
+    return std::equal(a.begin(), a.end(), b.begin(), b.end());
   }
 
  private:
   static std::size_t max_elements() { return std::size_t{1} << 31; }
+
+  // The bounds are gone; the storage (if any is left) stays value-initialised.
+  void forget() {
+    items_.clear();
+    size_ = 0;
+    dims_ = {Bounds{}, Bounds{}};
+    rank_ = 0;
+  }
+
+  // redim_preserve when the new bounds do not fit in the spare elements.
+  void redim_preserve_elsewhere(Long lower, Long upper) {
+    const std::size_t n = count(Bounds{lower, upper});
+    if (rank_ == 1 && lower == dims_[0].lower) {
+      if (n <= size_) {
+        // Cut: the dropped elements go back to their initial value, so that
+        // a later growth over them finds them value-initialised.
+        std::fill(begin() + static_cast<std::ptrdiff_t>(n), end(), T{});
+      } else {
+        // Grow the storage geometrically; every new element is
+        // value-initialised, spare ones included.
+        allocate(items_, std::max(n, std::min(2 * items_.size(), max_elements())));
+      }
+      size_ = n;
+      dims_[0].upper = upper;
+      return;
+    }
+    std::vector<T> fresh;
+    allocate(fresh, n);
+    if (rank_ == 2) raise(kSubscriptOutOfRange);
+    if (rank_ == 1) {
+      const Long from = std::max(lower, dims_[0].lower);
+      const Long to = std::min(upper, dims_[0].upper);
+      for (Long i = from; i <= to && from <= to; ++i) {
+        fresh[static_cast<std::size_t>(static_cast<long long>(i) - lower)] =
+            std::move(items_[static_cast<std::size_t>(static_cast<long long>(i) - dims_[0].lower)]);
+      }
+    }
+    items_ = std::move(fresh);
+    size_ = n;
+    dims_ = {Bounds{lower, upper}, Bounds{}};
+    rank_ = 1;
+  }
 
   static std::size_t count(Bounds b) {
     const long long n = static_cast<long long>(b.upper) - b.lower + 1;
@@ -196,7 +268,9 @@ class Array {
            rows * static_cast<std::size_t>(static_cast<long long>(j) - dims_[1].lower);
   }
 
+  // The elements in index order, then spare value-initialised elements.
   std::vector<T> items_;
+  std::size_t size_ = 0;  // elements inside the bounds
   std::array<Bounds, 2> dims_{};
   int rank_ = 0;
 };

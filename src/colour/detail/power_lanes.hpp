@@ -49,7 +49,7 @@ inline void estimate_power_lanes(const SingleLanes& ratio, DoubleLanes& p) {
   // code without branches, which the compiler vectorises.
   SingleLanes xs;
   for (int i = 0; i < kLanes; ++i) {
-    const bool usable = (ratio[i] > kThreshold) & (ratio[i] <= kHighest);
+    const bool usable = (int{ratio[i] > kThreshold} & int{ratio[i] <= kHighest}) != 0;
     xs[i] = usable ? ratio[i] : 1.0f;
   }
   for (int i = 0; i < kLanes; ++i) {

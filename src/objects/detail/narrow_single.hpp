@@ -14,7 +14,7 @@
 namespace kvdata::detail {
 
 inline Single narrow_to_single(Double value) {
-  constexpr Double kLargest = std::numeric_limits<Single>::max();
+  constexpr Double kLargest = static_cast<Double>(std::numeric_limits<Single>::max());
   // Largest Single plus half a unit in its last place: from here on the nearest
   // value is infinity (the tie goes there too, the largest Single being odd).
   constexpr Double kRoundsToInfinity = kLargest + 0x1p103;

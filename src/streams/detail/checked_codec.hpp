@@ -8,10 +8,31 @@
 //   kvdata::Long n = 0;
 //   if (!kvdata::checked::read_long(bytes, pos, n)) return false;   // entry already logged
 
+#include <cstddef>
+#include <optional>
+#include <span>
+
 #include "kvdata/automation/array.hpp"
 #include "kvdata/automation/types.hpp"
 
 namespace kvdata::checked {
+
+// Room for a run of fixed-width values that take `n` bytes from Position on,
+// made as writing them one by one would make it: the array grows (lower
+// bound and contents kept) to end no earlier than Position + n - 1. Gives
+// those bytes, or nothing when one of those writes would fail (an array
+// that is not one-dimensional, a Position below the lower bound or past the
+// Long range, no memory); then the array is unchanged and nothing is logged,
+// and the caller writes the values one by one, the failing one logging its
+// entry. Position is not moved.
+[[nodiscard]] std::optional<std::span<Byte>> reserve_run(ByteArray& stream, Long position,
+                                                         std::size_t n) noexcept;
+
+// The `n` bytes of a run of fixed-width values from Position on, or nothing
+// when reading them one by one would fail on one of them (the caller then
+// reads them one by one). Position is not moved.
+[[nodiscard]] std::optional<std::span<const Byte>> peek_run(const ByteArray& stream, Long position,
+                                                            std::size_t n) noexcept;
 
 [[nodiscard]] bool write_integer(Integer value, ByteArray& stream, Long& position);
 [[nodiscard]] bool read_integer(const ByteArray& stream, Long& position, Integer& value);

@@ -12,6 +12,7 @@
 #include <bit>
 #include <cstddef>
 #include <cstdint>
+#include <cstring>
 #include <limits>
 #include <optional>
 #include <span>
@@ -105,6 +106,113 @@ template <WireScalar T>
     value = std::bit_cast<T>(static_cast<Bits>(bits));
     return true;
   }
+}
+
+// --- Runs of values --------------------------------------------------------
+// The same bytes as store_le / load_le of each value in turn, with one bounds
+// check for the whole run. On a little-endian host each image is the value's
+// own bit pattern, copied as a whole (which the compiler turns into vector
+// moves); elsewhere each value goes through store_le / load_le.
+
+namespace le_run {
+template <WireScalar T>
+inline void put(Byte* out, T value) {
+  using Bits = typename WireImage<T>::Bits;
+  const auto bits = std::bit_cast<Bits>(value);
+  std::memcpy(out, &bits, sizeof(Bits));
+}
+template <WireScalar T>
+inline T get(const Byte* in) {
+  using Bits = typename WireImage<T>::Bits;
+  Bits bits{};
+  std::memcpy(&bits, in, sizeof(Bits));
+  return std::bit_cast<T>(bits);
+}
+}  // namespace le_run
+
+// Writes the images of `values` one after another from `offset` on. False,
+// with the buffer untouched, when they do not all fit.
+template <WireScalar T>
+[[nodiscard]] bool store_le_run(std::span<Byte> out, std::size_t offset,
+                                std::span<const T> values) {
+  constexpr std::size_t w = kWireWidth<T>;
+  if (values.size() > out.size() / w || !fits(out.size(), offset, w * values.size())) return false;
+  if constexpr (std::endian::native == std::endian::little && !std::is_same_v<T, Date>) {
+    Byte* at = out.data() + offset;
+    for (std::size_t i = 0; i < values.size(); ++i) le_run::put(at + w * i, values[i]);
+  } else {
+    for (std::size_t i = 0; i < values.size(); ++i)
+      static_cast<void>(store_le(out, offset + w * i, values[i]));
+  }
+  return true;
+}
+
+// Writes a[0], b[0], a[1], b[1], ... from `offset` on; `a` and `b` have the
+// same length. False, with the buffer untouched, when they do not all fit
+// or the lengths differ.
+template <WireScalar T>
+[[nodiscard]] bool store_le_interleaved(std::span<Byte> out, std::size_t offset,
+                                        std::span<const T> a, std::span<const T> b) {
+  constexpr std::size_t w = kWireWidth<T>;
+  if (a.size() != b.size() || a.size() > out.size() / (2 * w) ||
+      !fits(out.size(), offset, 2 * w * a.size())) {
+    return false;
+  }
+  if constexpr (std::endian::native == std::endian::little && !std::is_same_v<T, Date>) {
+    Byte* at = out.data() + offset;
+    for (std::size_t i = 0; i < a.size(); ++i) {
+      le_run::put(at + 2 * w * i, a[i]);
+      le_run::put(at + 2 * w * i + w, b[i]);
+    }
+  } else {
+    for (std::size_t i = 0; i < a.size(); ++i) {
+      static_cast<void>(store_le(out, offset + 2 * w * i, a[i]));
+      static_cast<void>(store_le(out, offset + 2 * w * i + w, b[i]));
+    }
+  }
+  return true;
+}
+
+// Reads values.size() images one after another from `offset` on. False,
+// with `values` untouched, when they do not all lie inside the buffer.
+template <WireScalar T>
+[[nodiscard]] bool load_le_run(std::span<const Byte> in, std::size_t offset, std::span<T> values) {
+  constexpr std::size_t w = kWireWidth<T>;
+  if (values.size() > in.size() / w || !fits(in.size(), offset, w * values.size())) return false;
+  if constexpr (std::endian::native == std::endian::little && !std::is_same_v<T, Date>) {
+    const Byte* at = in.data() + offset;
+    for (std::size_t i = 0; i < values.size(); ++i) values[i] = le_run::get<T>(at + w * i);
+  } else {
+    for (std::size_t i = 0; i < values.size(); ++i)
+      static_cast<void>(load_le(in, offset + w * i, values[i]));
+  }
+  return true;
+}
+
+// Reads a[0], b[0], a[1], b[1], ... from `offset` on; `a` and `b` have the
+// same length. False, with both untouched, when the images do not all lie
+// inside the buffer or the lengths differ.
+template <WireScalar T>
+[[nodiscard]] bool load_le_interleaved(std::span<const Byte> in, std::size_t offset, std::span<T> a,
+                                       std::span<T> b) {
+  constexpr std::size_t w = kWireWidth<T>;
+  if (a.size() != b.size() || a.size() > in.size() / (2 * w) ||
+      !fits(in.size(), offset, 2 * w * a.size())) {
+    return false;
+  }
+  if constexpr (std::endian::native == std::endian::little && !std::is_same_v<T, Date>) {
+    const Byte* at = in.data() + offset;
+    for (std::size_t i = 0; i < a.size(); ++i) {
+      a[i] = le_run::get<T>(at + 2 * w * i);
+      b[i] = le_run::get<T>(at + 2 * w * i + w);
+    }
+  } else {
+    for (std::size_t i = 0; i < a.size(); ++i) {
+      static_cast<void>(load_le(in, offset + 2 * w * i, a[i]));
+      static_cast<void>(load_le(in, offset + 2 * w * i + w, b[i]));
+    }
+  }
+  return true;
 }
 
 // Copies `bytes` to `offset`. False, with the buffer untouched, when they do not fit.

@@ -1,0 +1,265 @@
+#!/usr/bin/env bash
+# Builds the release preset, runs the benchmark suite and the end-to-end
+# measurement of `kvdata colour`, and writes bench/RESULTS.md: every figure
+# with the machine it ran on, and every ratio to its limit or peer, all from
+# this one run.
+#
+#   ./scripts/run-benchmarks.sh                      # 5 repetitions, 1 000 000 spectra
+#   KVDATA_BENCH_REPETITIONS=9 ./scripts/run-benchmarks.sh
+#   KVDATA_BENCH_FILTER='^codec/' KVDATA_BENCH_REPETITIONS=1 ./scripts/run-benchmarks.sh   # a quick look
+#
+# Figures are medians over the repetitions, which run interleaved in random
+# order so that a change in the machine's load hits every benchmark alike.
+# Rates are per CPU second of the benchmark thread (one core); the load
+# average before and after the run is recorded beside them.
+set -euo pipefail
+cd "$(dirname "$0")/.."
+
+repetitions="${KVDATA_BENCH_REPETITIONS:-5}"
+filter="${KVDATA_BENCH_FILTER:-.}"          # a regular expression of benchmark names
+min_time="${KVDATA_BENCH_MIN_TIME:-0.5}"    # seconds per benchmark and repetition
+spectra="${KVDATA_BENCH_SPECTRA:-1000000}"
+small_spectra=$((spectra / 10))
+results=bench/RESULTS.md
+work="$(mktemp -d)"
+trap 'rm -rf "$work"' EXIT
+
+./scripts/install-deps.sh
+cmake --preset release >/dev/null
+cmake --build --preset release -j2
+
+bench_bin=build/release/bench/kvdata_bench
+kvdata_bin=build/release/bin/kvdata
+
+load_before="$(cut -d' ' -f1-3 /proc/loadavg)"
+echo "== benchmark suite ($repetitions repetitions, load average $load_before)" >&2
+"$bench_bin" \
+  --benchmark_filter="$filter" --benchmark_min_time="$min_time" \
+  --benchmark_repetitions="$repetitions" \
+  --benchmark_enable_random_interleaving=true \
+  --benchmark_report_aggregates_only=true \
+  --benchmark_out="$work/suite.json" --benchmark_out_format=json >&2
+
+# The medians (or, with one repetition, the single runs), with the cv of the
+# CPU time beside each.
+jq '
+  [.benchmarks[] | select(.run_type == "aggregate")] as $a
+  | ([$a[] | select(.aggregate_name == "cv") | {key: .run_name, value: .cpu_time}] | from_entries) as $cv
+  | [$a[] | select(.aggregate_name == "median")] as $m
+  | (if ($m | length) > 0 then $m else [.benchmarks[] | select(.run_type == "iteration")] end)
+  | map(. + {cv: ($cv[.run_name] // 0)})' "$work/suite.json" >"$work/medians.json"
+
+# name <TAB> cpu ns <TAB> real ns <TAB> bytes/s <TAB> items/s <TAB> cv of cpu time
+jq -r '.[] | [.run_name, .cpu_time, .real_time, (.bytes_per_second // 0), (.items_per_second // 0),
+  .cv] | @tsv' "$work/medians.json" >"$work/medians.tsv"
+
+# field NAME COLUMN: one median figure (2 cpu ns, 3 real ns, 4 bytes/s, 5 items/s, 6 cv).
+field() {
+  awk -F'\t' -v n="$1" -v c="$2" '$1 == n { print $c; found = 1 } END { if (!found) print "" }' \
+    "$work/medians.tsv"
+}
+has() { [ -n "$(field "$1" 2)" ]; }
+# ratio A B: cpu time of A over cpu time of B, two decimals.
+ratio() { awk -v a="$(field "$1" 2)" -v b="$(field "$2" 2)" 'BEGIN { printf "%.2f", a / b }'; }
+gbps() { awk -v v="$(field "$1" 4)" 'BEGIN { printf "%.2f", v / 1e9 }'; }
+mps() { awk -v v="$(field "$1" 5)" 'BEGIN { printf "%.2f", v / 1e6 }'; }
+usec() { awk -v v="$(field "$1" 2)" 'BEGIN { printf "%.1f", v / 1e3 }'; }
+cv() { awk -v v="$(field "$1" 6)" 'BEGIN { printf "%.0f %%", v * 100 }'; }
+# verdict VALUE LIMIT [le|ge]: "met" or "missed".
+verdict() {
+  awk -v v="$1" -v l="$2" -v how="${3:-le}" \
+    'BEGIN { ok = (how == "le") ? (v <= l) : (v >= l); print ok ? "met" : "**missed**" }'
+}
+
+# --- the command end to end ---------------------------------------------------
+e2e_rows=""
+e2e_note=""
+colour_share=""
+if [ -x "$kvdata_bin" ] && "$kvdata_bin" colour --help >/dev/null 2>&1; then
+  echo "== kvdata colour end to end" >&2
+  make_csv() {  # make_csv COUNT FILE: COUNT spectra in percent, 40 bands 360..750 nm
+    awk -v n="$1" 'BEGIN {
+      srand(7); printf "SAMPLE_NAME";
+      for (w = 360; w <= 750; w += 10) printf ",%d", w; printf "\n";
+      for (i = 1; i <= n; i++) {
+        printf "S%d", i; level = 5 + 90 * rand(); scale = 0.05 + 0.95 * rand();
+        for (b = 0; b < 40; b++) {
+          level += 8 * rand() - 4; if (level < 0) level = 0; if (level > 100) level = 100;
+          printf ",%.3f", level * scale }
+        printf "\n" } }' >"$2"
+  }
+  timed() {  # timed LABEL COMMAND...: wall s, cpu s and peak kB of one process
+    local log="$work/time.$1"
+    if [ -x /usr/bin/time ]; then
+      /usr/bin/time -v "${@:2}" >/dev/null 2>"$log"
+      awk -F': ' '
+        /Elapsed \(wall clock\)/ { n = split($2, p, ":"); s = 0; for (i = 1; i <= n; i++) s = s * 60 + p[i]; wall = s }
+        /User time/ { cpu += $2 } /System time/ { cpu += $2 }
+        /Maximum resident set size/ { rss = $2 }
+        END { printf "%.2f\t%.2f\t%d\n", wall, cpu, rss }' "$log"
+    else
+      local start end
+      start=$(date +%s.%N)
+      "${@:2}" >/dev/null
+      end=$(date +%s.%N)
+      awk -v a="$start" -v b="$end" 'BEGIN { printf "%.2f\t\t\n", b - a }'
+    fi
+  }
+  for n in "$small_spectra" "$spectra"; do
+    make_csv "$n" "$work/spectra_$n.csv"
+    bytes=$(stat -c %s "$work/spectra_$n.csv")
+    read_figures=$(timed "cat_$n" cat "$work/spectra_$n.csv")
+    colour_figures=$(timed "colour_$n" "$kvdata_bin" colour "$work/spectra_$n.csv" --format csv \
+      -o "$work/out_$n.csv")
+    IFS=$'\t' read -r wall cpu rss <<<"$colour_figures"
+    IFS=$'\t' read -r cat_wall cat_cpu cat_rss <<<"$read_figures"
+    rate=$(awk -v n="$n" -v w="$wall" 'BEGIN { printf "%.2f", n / w / 1e6 }')
+    cpu_rate=$(awk -v n="$n" -v c="$cpu" 'BEGIN { printf "%.2f", (c > 0) ? n / c / 1e6 : 0 }')
+    e2e_rows+="| $n | $((bytes / 1000000)) MB | $wall s | $cpu s | $rate | $cpu_rate | $((rss / 1024)) MB | $cat_wall s |"$'\n'
+    eval "rss_$n=$rss"
+    eval "cpu_$n=$cpu"
+  done
+  rss_small=$(eval echo "\$rss_$small_spectra")
+  rss_large=$(eval echo "\$rss_$spectra")
+  cpu_large=$(eval echo "\$cpu_$spectra")
+  rss_growth=$(awk -v a="$rss_small" -v b="$rss_large" 'BEGIN { printf "%.1f", b / a }')
+  if has colour/spectra/batch; then
+    colour_share=$(awk -v n="$spectra" -v r="$(field colour/spectra/batch 5)" -v c="$cpu_large" \
+      'BEGIN { printf "%.1f", 100 * (n / r) / c }')
+  fi
+else
+  e2e_note="The \`kvdata colour\` command was not built in this tree, so the end-to-end figures are missing."
+fi
+load_after="$(cut -d' ' -f1-3 /proc/loadavg)"
+
+# --- RESULTS.md -------------------------------------------------------------------
+cpu_model="$(grep -m1 'model name' /proc/cpuinfo | cut -d: -f2- | sed 's/^ *//')"
+cpu_mhz="$(grep -m1 'cpu MHz' /proc/cpuinfo | cut -d: -f2- | sed 's/^ *//')"
+cores="$(nproc)"
+mem_kb="$(awk '/MemTotal/ { print $2 }' /proc/meminfo)"
+compiler="$(g++ --version | head -1)"
+host_wall_ratio="$(jq -r 'map(.real_time / .cpu_time) | add / length' "$work/medians.json")"
+
+{
+  echo "# Benchmark results"
+  echo
+  echo "Written by \`scripts/run-benchmarks.sh\` on $(date -u '+%Y-%m-%d %H:%M UTC'); every figure and"
+  echo "ratio below comes from this one run. Do not edit by hand: run the script again."
+  echo
+  echo "## Machine"
+  echo
+  echo "| | |"
+  echo "|---|---|"
+  echo "| CPU | $cpu_model, ${cpu_mhz} MHz |"
+  echo "| cores | $cores |"
+  echo "| memory | $((mem_kb / 1024)) MB |"
+  echo "| kernel | $(uname -r) |"
+  echo "| compiler | $compiler, release preset (-O3) |"
+  echo "| load average (1, 5, 15 min) | before $load_before; after $load_after |"
+  echo "| wall time / CPU time, median over the suite | $(printf '%.2f' "$host_wall_ratio") |"
+  echo
+  echo "Each figure is the median of $repetitions repetitions run interleaved in random order; rates"
+  echo "are per CPU second of the one benchmark thread (one core), so other work on the machine"
+  echo "shows in the wall/CPU ratio above rather than in the rates. \"cv\" is the coefficient of"
+  echo "variation of the CPU time over the repetitions. A ratio is CPU time of the library over CPU"
+  echo "time of its limit or peer for the same work."
+  echo
+  echo "## Field codec: runs of one type"
+  echo
+  echo "One million values (200 000 strings of 0 to 31 characters) written one by one into an"
+  echo "array that starts empty (\`unsized\`), into a new array made at the final size"
+  echo "(\`presized\`), into one array sized once and reused (\`reused\`), and read back; \`memcpy\`"
+  echo "copies the same bytes between two existing buffers. GB/s of stream."
+  echo
+  echo "| type | unsized | presized | reused | read | memcpy | unsized / presized (target <= 2) | unsized / reused | reused write / memcpy | read / memcpy |"
+  echo "|---|---|---|---|---|---|---|---|---|---|"
+  for t in Integer Long Single Date Boolean String; do
+    b="codec/$t"
+    has "$b/memcpy" || continue
+    r=$(ratio "$b/write_unsized" "$b/write_presized")
+    echo "| $t | $(gbps "$b/write_unsized") | $(gbps "$b/write_presized") | $(gbps "$b/write_reused") | $(gbps "$b/read") | $(gbps "$b/memcpy") | $r ($(verdict "$r" 2)) | $(ratio "$b/write_unsized" "$b/write_reused") | $(ratio "$b/write_reused" "$b/memcpy") | $(ratio "$b/read" "$b/memcpy") |"
+  done
+  echo
+  echo "## Object streams"
+  echo
+  echo "\`StreamOut\` at Position 0 into an array left at the stream's length by the previous call;"
+  echo "\`StreamIn\` of that stream into one object; \`memcpy\` of the same number of bytes. The"
+  echo "target (within 4 times memcpy) applies to the large test run."
+  echo
+  echo "| object | bytes | StreamOut µs | StreamIn µs | memcpy µs | StreamOut / memcpy | StreamIn / memcpy | cv (out, in) |"
+  echo "|---|---|---|---|---|---|---|---|"
+  awk -F'\t' '$1 ~ /^objects\/.*\/memcpy$/ { sub(/^objects\//, "", $1); sub(/\/memcpy$/, "", $1); print $1 }' \
+    "$work/medians.tsv" | while read -r o; do
+    b="objects/$o"
+    bytes=$(jq -r --arg n "$b/StreamOut" '[.[] | select(.run_name == $n) | .stream_bytes][0]' "$work/medians.json")
+    out_r=$(ratio "$b/StreamOut" "$b/memcpy")
+    in_r=$(ratio "$b/StreamIn" "$b/memcpy")
+    if [[ "$o" == *1000* ]]; then
+      out_r="$out_r ($(verdict "$out_r" 4))"
+      in_r="$in_r ($(verdict "$in_r" 4))"
+    fi
+    echo "| $o | $bytes | $(usec "$b/StreamOut") | $(usec "$b/StreamIn") | $(usec "$b/memcpy") | $out_r | $in_r | $(cv "$b/StreamOut"), $(cv "$b/StreamIn") |"
+  done
+  echo
+  if has colour/spectra/batch; then
+    batch=$(mps colour/spectra/batch)
+    echo "## Colorimetry"
+    echo
+    echo "100 000 spectra of percent reflectance (a twentieth of them dark enough for the linear"
+    echo "branch). Millions of spectra (conversions, differences) per CPU second, one core."
+    echo
+    echo "| benchmark | M/s | cv |"
+    echo "|---|---|---|"
+    for b in colour/spectra/Reflectance colour/spectra/calcXYZ_calcLAB colour/spectra/batch \
+      colour/xyz_to_lab/calcLAB colour/xyz_to_lab/lcms_cmsXYZ2Lab colour/delta_e/Deltas \
+      colour/delta_e/lcms_cmsDeltaE; do
+      has "$b" && echo "| \`${b#colour/}\` | $(mps "$b") | $(cv "$b") |"
+    done
+    echo
+    echo "| comparison | figure |"
+    echo "|---|---|"
+    echo "| batch, spectra per second per core (target >= 10 M, bit-identical to calcXYZ + calcLAB) | $batch M ($(verdict "$batch" 10 ge)); values differing from calcXYZ + calcLAB: $(jq -r '[.[] | select(.run_name == "colour/spectra/batch") | .differing_values][0] // "n/a"' "$work/medians.json") |"
+    echo "| batch / one spectrum at a time (calcXYZ + calcLAB), speed-up | $(ratio colour/spectra/calcXYZ_calcLAB colour/spectra/batch) |"
+    echo "| calcLAB / cmsXYZ2Lab, time per conversion | $(ratio colour/xyz_to_lab/calcLAB colour/xyz_to_lab/lcms_cmsXYZ2Lab) |"
+    echo "| batch (spectrum to XYZ and CIELAB) / cmsXYZ2Lab (XYZ to CIELAB only), time per spectrum | $(ratio colour/spectra/batch colour/xyz_to_lab/lcms_cmsXYZ2Lab) |"
+    echo "| Deltas / cmsDeltaE, time per difference | $(ratio colour/delta_e/Deltas colour/delta_e/lcms_cmsDeltaE) |"
+    echo
+  fi
+  if has stats/spread_1000x40/calculate; then
+    echo "## Spread test"
+    echo
+    echo "1000 samples of 40 points for each of the two tiles; samples per CPU second. The plain"
+    echo "loop computes the same mean, lowest, highest and spread from one flat array."
+    echo
+    echo "| benchmark | M samples/s | µs per test | cv |"
+    echo "|---|---|---|---|"
+    for b in add_and_calculate calculate plain_loop; do
+      echo "| \`$b\` | $(mps "stats/spread_1000x40/$b") | $(usec "stats/spread_1000x40/$b") | $(cv "stats/spread_1000x40/$b") |"
+    done
+    echo
+    echo "calculate / plain loop: $(ratio stats/spread_1000x40/calculate stats/spread_1000x40/plain_loop)"
+    echo
+  fi
+  echo "## \`kvdata colour\` end to end"
+  echo
+  if [ -n "$e2e_note" ]; then
+    echo "$e2e_note"
+  else
+    echo "A CSV of spectra (sample name and 40 bands with three decimals) converted with"
+    echo "\`--format csv -o FILE\`; one process each, measured by GNU time. \`cat\` is reading the"
+    echo "same file to /dev/null."
+    echo
+    echo "| spectra | file | wall | CPU (user + sys) | M spectra/s (wall) | M spectra/s (CPU) | peak memory | cat wall |"
+    echo "|---|---|---|---|---|---|---|---|"
+    printf '%s' "$e2e_rows"
+    echo
+    echo "- Peak memory at $spectra spectra is $rss_growth times that at $small_spectra (a streaming"
+    echo "  command stays near 1)."
+    if [ -n "$colour_share" ]; then
+      echo "- The colour work (the batch rate above applied to $spectra spectra) is $colour_share % of"
+      echo "  the command's CPU time; the rest is reading, parsing and writing."
+    fi
+  fi
+} >"$results"
+
+echo "== wrote $results" >&2

@@ -1,0 +1,554 @@
+// Bad input for the record streams, one group per class of fault: streams
+// cut short, hostile counts, Positions outside the stream, arrays without
+// bounds or with another lower bound, wrong type names, and text that
+// Windows-1252 cannot carry. Each case asserts the result, what stays
+// unchanged, where Position ends and the event-log entries.
+
+#include <gtest/gtest.h>
+
+#include <cstdint>
+#include <functional>
+#include <limits>
+#include <string>
+#include <vector>
+
+#include "kvdata/kvdata.hpp"
+#include "streams/stream_test_support.hpp"
+
+namespace kvdata {
+namespace {
+
+using testing::contents;
+using testing::LogCapture;
+using testing::sc_pair;
+using testing::spectrum;
+using testing::stream_of;
+using testing::Wire;
+using Bytes = std::vector<Byte>;
+
+constexpr auto kTo = eStreamDirection::ToStream;
+constexpr auto kFrom = eStreamDirection::FromStream;
+constexpr Long kLongMin = std::numeric_limits<Long>::min();
+constexpr Long kLongMax = std::numeric_limits<Long>::max();
+
+Streams& streams() {
+  return Streams::instance();
+}
+
+tStation station() {
+  return tStation{u"{4F1C}", u"Lab 2", u"lab2@example.org"};
+}
+
+tOVProfile profile() {
+  tOVProfile pro;
+  pro.ISN = u"SN42";
+  pro.Created = Date{45123.5};
+  pro.Validated = true;
+  tOVProfileDataV1 tables;
+  tables.wCal(0) = spectrum(100);
+  tables.Dark(1) = spectrum(400);
+  pro.ProfileData = Variant(tables);
+  return pro;
+}
+
+tUser user() {
+  tUser u;
+  u.USERID = u"ANN";
+  u.UserNumber = 12;
+  u.LastName = u"Smith";
+  u.FirstName = u"Ann";
+  u.UserMail = u"ann@example.org";
+  u.OrgID = 3;
+  u.RoleCode = u"A";
+  return u;
+}
+
+tOrganization organization() {
+  return tOrganization{4, u"Calibration Lab", 1, 1, u"CAL", u"Y"};
+}
+
+// One record stream under test: how to write a sample and how to read into
+// a record in a known state, with what the reader promises about that record.
+struct Case {
+  const char* name;
+  // Writes the sample record at Position of `s`.
+  std::function<bool(ByteArray& s, Long& p)> write;
+  // Reads into a record in a known state; `unchanged` tells whether that
+  // record (or, for readers that store values directly, the part they
+  // replace only as a whole) is still as it was.
+  std::function<bool(ByteArray& s, Long& p, bool& unchanged)> read;
+  // Room a fixed-size block needs to be written (0: the writer grows the stream).
+  Long block = 0;
+  // Failures are found by the field codec, one entry each (blocks log nothing).
+  bool logs = true;
+};
+
+std::vector<Case> cases() {
+  std::vector<Case> all;
+  all.push_back({"SC pair",
+                 [](ByteArray& s, Long& p) {
+                   tSCPair pair = sc_pair(1);
+                   return streams().Stream_SCPair(kTo, s, p, pair);
+                 },
+                 [](ByteArray& s, Long& p, bool& unchanged) {
+                   // Values are stored as they are read: the first one
+                   // decides whether anything changed.
+                   tSCPair pair = sc_pair(7);
+                   const bool ok = streams().Stream_SCPair(kFrom, s, p, pair);
+                   unchanged =
+                       pair.Spectrum(eSC::SCE).Data(1) == sc_pair(7).Spectrum(eSC::SCE).Data(1);
+                   return ok;
+                 }});
+  all.push_back({"station",
+                 [](ByteArray& s, Long& p) {
+                   tStation st = station();
+                   return streams().Stream_Station(kTo, s, p, st);
+                 },
+                 [](ByteArray& s, Long& p, bool& unchanged) {
+                   // A first count that cannot be read empties StationGUID
+                   // (the codec's rule); the name after it is not attempted.
+                   tStation st{u"a", u"b", u"c"};
+                   const bool ok = streams().Stream_Station(kFrom, s, p, st);
+                   unchanged = st.StationName == u"b";
+                   return ok;
+                 }});
+  all.push_back({"profile",
+                 [](ByteArray& s, Long& p) {
+                   tOVProfile pro = profile();
+                   return streams().Stream_Profile(kTo, s, p, pro);
+                 },
+                 [](ByteArray& s, Long& p, bool& unchanged) {
+                   // The tables are replaced only when all 320 values were read.
+                   tOVProfile pro;
+                   pro.ProfileData = Variant(String(u"old"));
+                   const bool ok = streams().Stream_Profile(kFrom, s, p, pro);
+                   unchanged = pro.ProfileData == Variant(String(u"old"));
+                   return ok;
+                 }});
+  all.push_back({"user block",
+                 [](ByteArray& s, Long& p) {
+                   tUser u = user();
+                   return streams().Stream_User(kTo, s, p, u);
+                 },
+                 [](ByteArray& s, Long& p, bool& unchanged) {
+                   tUser u;
+                   u.USERID = u"OLD";
+                   const tUser before = u;
+                   const bool ok = streams().Stream_User(kFrom, s, p, u);
+                   unchanged = u == before;
+                   return ok;
+                 },
+                 261, false});
+  all.push_back({"organization",
+                 [](ByteArray& s, Long& p) {
+                   tOrganization org = organization();
+                   return streams().Stream_Organization(kTo, s, p, org);
+                 },
+                 [](ByteArray& s, Long& p, bool& unchanged) {
+                   tOrganization org;
+                   org.Alias = u"OLD";
+                   const tOrganization before = org;
+                   const bool ok = streams().Stream_Organization(kFrom, s, p, org);
+                   unchanged = org == before;
+                   return ok;
+                 },
+                 133, false});
+  return all;
+}
+
+// The sample's encoding from index 0.
+Bytes encoding(const Case& c) {
+  ByteArray s(0, c.block - 1);
+  Long p = 0;
+  EXPECT_TRUE(c.write(s, p)) << c.name;
+  EXPECT_EQ(p, static_cast<Long>(s.size())) << c.name;
+  return contents(s);
+}
+
+// The tile-set and test-run streams have their own truncation tests; these
+// are the other record streams, cut after every byte.
+TEST(BadInputTruncation, EveryRecordStreamCutShortIsFalse) {
+  LogCapture log;
+  for (const Case& c : cases()) {
+    const Bytes full = encoding(c);
+    for (std::size_t cut = 0; cut < full.size(); ++cut) {
+      log.entries.clear();
+      ByteArray s = stream_of(Bytes(full.begin(), full.begin() + static_cast<long>(cut)));
+      const ByteArray before = s;
+      Long p = 0;
+      bool unchanged = false;
+      EXPECT_FALSE(c.read(s, p, unchanged)) << c.name << " cut at " << cut;
+      EXPECT_EQ(s, before) << c.name;
+      EXPECT_LE(p, static_cast<Long>(cut)) << c.name << " cut at " << cut;
+      EXPECT_EQ(log.entries.size(), c.logs ? 1u : 0u) << c.name << " cut at " << cut;
+      // Blocks are taken whole or not at all; the SC pair and the station
+      // store values as they come, so only a cut before the first value
+      // leaves them untouched.
+      if (!c.logs || cut < 4) {
+        EXPECT_TRUE(unchanged) << c.name << " cut at " << cut;
+      }
+    }
+    // The whole stream reads.
+    ByteArray s = stream_of(full);
+    Long p = 0;
+    bool unchanged = true;
+    EXPECT_TRUE(c.read(s, p, unchanged)) << c.name;
+    EXPECT_EQ(p, static_cast<Long>(full.size())) << c.name;
+    EXPECT_FALSE(unchanged) << c.name;
+  }
+}
+
+TEST(BadInputTruncation, ProfileTablesCutAnywhereKeepTheOldTables) {
+  // Every cut inside the 320 table values: the header is replaced, the
+  // tables are not, and the one entry names the value that failed.
+  LogCapture log;
+  ByteArray full(0, -1);
+  Long end = 0;
+  tOVProfile written = profile();
+  ASSERT_TRUE(streams().Stream_Profile(kTo, full, end, written));
+  const Long tables_at = end - 320 * 4;
+  const Bytes bytes = contents(full);
+  for (Long cut = tables_at; cut < end; cut += 3) {
+    log.entries.clear();
+    ByteArray s = stream_of(Bytes(bytes.begin(), bytes.begin() + cut));
+    tOVProfile pro;
+    pro.ProfileData = Variant(String(u"old"));
+    Long p = 0;
+    EXPECT_FALSE(streams().Stream_Profile(kFrom, s, p, pro));
+    EXPECT_EQ(pro.ISN, u"SN42");
+    EXPECT_EQ(pro.ProfileData, Variant(String(u"old")));
+    EXPECT_EQ(p, tables_at + (cut - tables_at) / 4 * 4);
+    ASSERT_EQ(log.entries.size(), 1u);
+    EXPECT_EQ(log.entries[0].rfind(u"Error in SUB SingleFromArray - Value = 0. ", 0), 0u);
+  }
+}
+
+TEST(BadInputHostileCounts, StringCountsNearTheLimitsAreRefusedBeforeAllocating) {
+  LogCapture log;
+  // A station whose first count is hostile, with 300 bytes after it.
+  for (const std::int64_t count : std::vector<std::int64_t>{
+           301, 65535, 65536, 0x7FFFFFFF, -1, -256, -65536, static_cast<std::int64_t>(kLongMin)}) {
+    log.entries.clear();
+    Wire w;
+    w.l32(static_cast<std::int32_t>(count)).zeros(300);
+    ByteArray s = stream_of(w.bytes);
+    tStation st{u"a", u"b", u"c"};
+    Long p = 0;
+    testing::reset_largest_allocation();
+    EXPECT_FALSE(streams().Stream_Station(kFrom, s, p, st)) << count;
+    EXPECT_LT(testing::largest_allocation(), 4096u) << count;
+    EXPECT_EQ(st, (tStation{u"a", u"b", u"c"})) << count;
+    EXPECT_EQ(p, 4) << count;
+    ASSERT_EQ(log.entries.size(), 1u) << count;
+    EXPECT_NE(
+        log.entries[0].find(u"String Size = " + Variant(static_cast<Long>(count)).to_string()),
+        String::npos);
+  }
+  // Counts at the 8-bit edge and one that takes every byte left: the text
+  // is read, and the next count is the one that runs out (and reads as empty).
+  for (const std::int32_t count : {255, 256, 300}) {
+    log.entries.clear();
+    Wire w;
+    w.l32(count);
+    w.bytes.insert(w.bytes.end(), static_cast<std::size_t>(count), Byte{'x'});
+    ByteArray s = stream_of(w.bytes);
+    tStation st{u"a", u"b", u"c"};
+    Long p = 0;
+    EXPECT_FALSE(streams().Stream_Station(kFrom, s, p, st)) << count;
+    EXPECT_EQ(st, (tStation{String(static_cast<std::size_t>(count), u'x'), u"", u"c"})) << count;
+    EXPECT_EQ(p, 4 + count) << count;
+    EXPECT_EQ(log.entries.size(), 1u) << count;
+  }
+}
+
+TEST(BadInputHostileCounts, TileCountsAtTheEightBitLimit) {
+  LogCapture log;
+  // 254 tiles is the most the stream carries, and it reads in full.
+  const auto stream_with = [](std::int32_t count, std::size_t tiles) {
+    Wire w;
+    w.str("TS").l32(count);
+    for (std::size_t i = 0; i < tiles; ++i) w.str("").l32(0).zeros(160);
+    w.f64(1.0).f32(2.0f).zeros(tiles * 320);
+    return w.bytes;
+  };
+  ByteArray s = stream_of(stream_with(254, 254));
+  tTileSet ts;
+  tTileSetCalibration tsc;
+  Long p = 0;
+  ASSERT_TRUE(streams().Stream_TileSetCalibration(kFrom, s, p, ts, tsc));
+  EXPECT_EQ(ts.Tiles.lbound(), 1);
+  EXPECT_EQ(ts.Tiles.ubound(), 254);
+  EXPECT_EQ(tsc.Tiles.ubound(), 254);
+  EXPECT_EQ(p, static_cast<Long>(s.size()));
+
+  // One byte short, or one tile more than the counter holds (with all its
+  // bytes there): refused, both records unchanged, nothing logged.
+  const tTileSet ts_before = ts;
+  Bytes short_one = stream_with(254, 254);
+  short_one.pop_back();
+  for (const Bytes& bytes : {short_one, stream_with(255, 255), stream_with(256, 256),
+                             stream_with(65535, 1), stream_with(65536, 1)}) {
+    ByteArray bad = stream_of(bytes);
+    p = 0;
+    testing::reset_largest_allocation();
+    EXPECT_FALSE(streams().Stream_TileSetCalibration(kFrom, bad, p, ts, tsc));
+    EXPECT_LT(testing::largest_allocation(), 200000u);
+    EXPECT_EQ(ts, ts_before);
+  }
+  EXPECT_TRUE(log.entries.empty());
+}
+
+TEST(BadInputHostileCounts, NegativeSeriesCountsGiveSeriesWithoutTiles) {
+  LogCapture log;
+  tTestRun1 written;
+  written.IIA.TSN = u"TS";
+  ByteArray full(0, -1);
+  Long end = 0;
+  ASSERT_TRUE(streams().Stream_TestRun(kTo, full, end, written));
+  // The last two bytes are the only series' tile count.
+  for (const std::int16_t count : {std::int16_t{-1}, std::int16_t{-32768}}) {
+    ByteArray s = full;
+    s(end - 2) = static_cast<Byte>(count & 0xFF);
+    s(end - 1) = static_cast<Byte>((count >> 8) & 0xFF);
+    tTestRun1 tr;
+    tr.Comment = u"old";
+    Long p = 0;
+    ASSERT_TRUE(streams().Stream_TestRun(kFrom, s, p, tr)) << count;
+    EXPECT_EQ(p, end);
+    EXPECT_FALSE(tr.IIA.Measurements(1).Tiles.has_bounds());
+    EXPECT_EQ(tr.Comment, u"");
+  }
+  // A count that needs one byte more than there is.
+  ByteArray s = full;
+  s(end - 2) = 1;
+  s.redim_preserve(0, end - 1 + 639);
+  tTestRun1 tr;
+  tr.Comment = u"old";
+  Long p = 0;
+  EXPECT_FALSE(streams().Stream_TestRun(kFrom, s, p, tr));
+  EXPECT_EQ(tr.Comment, u"old");
+  EXPECT_EQ(p, end);
+  EXPECT_TRUE(log.entries.empty());
+}
+
+TEST(BadInputPositions, ReadersOutsideTheStreamChangeNothing) {
+  LogCapture log;
+  for (const Case& c : cases()) {
+    const Bytes full = encoding(c);
+    // The stream from index 0, and the same bytes at the top of the Long range.
+    ByteArray low = stream_of(full);
+    ByteArray top = stream_of(full, kLongMax - static_cast<Long>(full.size()) + 1);
+    const struct {
+      ByteArray* stream;
+      Long position;
+    } outside[] = {
+        {&low, -1},
+        {&low, kLongMin},
+        {&low, static_cast<Long>(full.size())},  // just past the end
+        {&low, kLongMax},
+        {&top, 0},
+        {&top, kLongMax - 2},  // inside, but no value fits before the Long ends
+        {&top, kLongMax},
+    };
+    for (const auto& o : outside) {
+      log.entries.clear();
+      const ByteArray before = *o.stream;
+      Long p = o.position;
+      bool unchanged = false;
+      EXPECT_FALSE(c.read(*o.stream, p, unchanged)) << c.name << " at " << o.position;
+      EXPECT_TRUE(unchanged) << c.name << " at " << o.position;
+      EXPECT_EQ(*o.stream, before) << c.name;
+      if (c.logs) {
+        EXPECT_EQ(p, o.position) << c.name << " at " << o.position;
+        EXPECT_EQ(log.entries.size(), 1u) << c.name << " at " << o.position;
+      } else {
+        // A block consumes what is there and no more.
+        EXPECT_GE(p, o.position) << c.name;
+        EXPECT_LE(static_cast<long long>(p) - o.position, 2) << c.name;
+        EXPECT_TRUE(log.entries.empty()) << c.name;
+      }
+    }
+  }
+}
+
+TEST(BadInputPositions, WritersBelowTheStreamWriteNothing) {
+  LogCapture log;
+  for (const Case& c : cases()) {
+    log.entries.clear();
+    ByteArray s = stream_of(Bytes(static_cast<std::size_t>(c.block > 0 ? c.block : 8), 0x5A));
+    const ByteArray before = s;
+    Long p = -1;
+    EXPECT_FALSE(c.write(s, p)) << c.name;
+    EXPECT_EQ(s, before) << c.name;
+    EXPECT_EQ(p, -1) << c.name;
+    EXPECT_EQ(log.entries.size(), c.logs ? 1u : 0u) << c.name;
+  }
+}
+
+TEST(BadInputArrays, StreamsWithoutBoundsOrAnotherLowerBound) {
+  LogCapture log;
+  for (const Case& c : cases()) {
+    const Bytes full = encoding(c);
+    // Without bounds: nothing to read, the record stays.
+    log.entries.clear();
+    ByteArray none;
+    Long p = 0;
+    bool unchanged = false;
+    EXPECT_FALSE(c.read(none, p, unchanged)) << c.name;
+    EXPECT_TRUE(unchanged) << c.name;
+    EXPECT_FALSE(none.has_bounds()) << c.name;
+    EXPECT_EQ(p, 0) << c.name;
+    EXPECT_EQ(log.entries.size(), c.logs ? 1u : 0u) << c.name;
+
+    // Lower bounds 1 (a loaded stream) and -7: read from the lower bound,
+    // the record comes back whole; from one index below, it does not.
+    for (const Long lower : {1, -7}) {
+      ByteArray s = stream_of(full, lower);
+      p = lower;
+      EXPECT_TRUE(c.read(s, p, unchanged)) << c.name << " from " << lower;
+      EXPECT_EQ(p, lower + static_cast<Long>(full.size())) << c.name;
+      p = lower - 1;
+      EXPECT_FALSE(c.read(s, p, unchanged)) << c.name << " from " << lower - 1;
+      EXPECT_TRUE(unchanged) << c.name;
+    }
+  }
+}
+
+TEST(BadInputArrays, RecordArraysWithOtherBoundsOrRanks) {
+  LogCapture log;
+  // Tiles 5..7 travel as three tiles and come back as 1..3.
+  tTileSet ts;
+  ts.TSN = u"TS";
+  ts.Tiles.redim(5, 7);
+  ts.Tiles(6).Name = u"middle";
+  tTileSetCalibration tsc;
+  tsc.TSN = u"TS";
+  tsc.Tiles.redim(0, 9);
+  tsc.Tiles(6) = sc_pair(3);
+  ByteArray s(0, -1);
+  Long p = 0;
+  ASSERT_TRUE(streams().Stream_TileSetCalibration(kTo, s, p, ts, tsc));
+  tTileSet back;
+  tTileSetCalibration back_tsc;
+  p = 0;
+  ASSERT_TRUE(streams().Stream_TileSetCalibration(kFrom, s, p, back, back_tsc));
+  EXPECT_EQ(back.Tiles.lbound(), 1);
+  EXPECT_EQ(back.Tiles.ubound(), 3);
+  EXPECT_EQ(back.Tiles(2).Name, u"middle");
+  EXPECT_EQ(back_tsc.Tiles(2), sc_pair(3));
+
+  // A calibration that lacks one of the set's indices, or tiles in two
+  // dimensions: refused before anything is written.
+  tsc.Tiles.redim(5, 6);
+  ByteArray refused(0, -1);
+  p = 0;
+  EXPECT_FALSE(streams().Stream_TileSetCalibration(kTo, refused, p, ts, tsc));
+  ts.Tiles = Array<tTileDef>({{1, 2}, {1, 2}});
+  tsc.Tiles.redim(1, 2);
+  EXPECT_FALSE(streams().Stream_TileSetCalibration(kTo, refused, p, ts, tsc));
+  EXPECT_EQ(refused.ubound(), -1);
+  EXPECT_EQ(p, 0);
+
+  // Test-run series with tiles -2..0 come back as 1..3; a two-dimensional
+  // series is refused.
+  tTestRun1 tr;
+  tr.IIA.Measurements(1).Tiles.redim(-2, 0);
+  tr.IIA.Measurements(1).Tiles(0).Trial = sc_pair(9);
+  ByteArray run(0, -1);
+  p = 0;
+  ASSERT_TRUE(streams().Stream_TestRun(kTo, run, p, tr));
+  tTestRun1 run_back;
+  p = 0;
+  ASSERT_TRUE(streams().Stream_TestRun(kFrom, run, p, run_back));
+  EXPECT_EQ(run_back.IIA.Measurements(1).Tiles.lbound(), 1);
+  EXPECT_EQ(run_back.IIA.Measurements(1).Tiles(3).Trial, sc_pair(9));
+  tr.IIA.Measurements(1).Tiles = Array<tIIATile>({{1, 1}, {1, 1}});
+  ByteArray run_refused(0, -1);
+  p = 0;
+  EXPECT_FALSE(streams().Stream_TestRun(kTo, run_refused, p, tr));
+  EXPECT_EQ(run_refused.ubound(), -1);
+  EXPECT_TRUE(log.entries.empty());
+}
+
+TEST(BadInputTypeNames, ProfileTablesOfAnyOtherNameAreRefused) {
+  LogCapture log;
+  const std::vector<std::string> names = {"tOVProfileDataV2",
+                                          "tovprofiledatav1",
+                                          "TOVPROFILEDATAV1",
+                                          "tOVProfileDataV1 ",
+                                          " tOVProfileDataV1",
+                                          "tOVProfileData",
+                                          std::string("tOVProfileDataV1\0", 17),
+                                          ""};
+  for (const std::string& name : names) {
+    Wire w;
+    w.str("NEW").f64(7.0).boolean(true).str(name);
+    const std::size_t header = w.size();
+    for (int k = 0; k < 320; ++k) w.f32(1.0f);
+    ByteArray s = stream_of(w.bytes);
+    tOVProfile pro;
+    pro.ProfileData = Variant(String(u"old"));
+    Long p = 0;
+    EXPECT_FALSE(streams().Stream_Profile(kFrom, s, p, pro)) << name;
+    EXPECT_EQ(pro.ISN, u"NEW") << name;  // the header is stored before the check
+    EXPECT_TRUE(pro.Validated) << name;
+    EXPECT_EQ(pro.ProfileData, Variant(String(u"old"))) << name;
+    EXPECT_EQ(p, static_cast<Long>(header)) << name;
+  }
+  EXPECT_TRUE(log.entries.empty());
+}
+
+TEST(BadInputText, CodecTextThatWindows1252CannotCarryBecomesQuestionMarks) {
+  LogCapture log;
+  // CJK, a surrogate pair (one character), a lone surrogate and U+0100:
+  // each unrepresentable character is one '?', and the count counts bytes.
+  tStation st{u"\u65E5\u672C", u"\U0001F600x", u"\xD800\u0100"};
+  ByteArray s(0, -1);
+  Long p = 0;
+  ASSERT_TRUE(streams().Stream_Station(kTo, s, p, st));
+  EXPECT_EQ(contents(s), (Wire().str("??").str("?x").str("??").bytes));
+  tStation back;
+  p = 0;
+  ASSERT_TRUE(streams().Stream_Station(kFrom, s, p, back));
+  EXPECT_EQ(back, (tStation{u"??", u"?x", u"??"}));
+  EXPECT_EQ(p, static_cast<Long>(s.size()));
+  EXPECT_TRUE(log.entries.empty());
+}
+
+TEST(BadInputText, FixedWidthBlocksCarryAnyCodeUnit) {
+  // The user and organisation blocks hold UTF-16 units as they are, lone
+  // surrogates included; only blanks are trimmed.
+  tUser u;
+  u.USERID = u"\u65E5\xD800";
+  u.LastName = u"\U0001F600";
+  u.RoleCode = u"\u00E9";  // below 256: its low byte is all that travels, and all it needs
+  ByteArray s(0, 260);
+  Long p = 0;
+  ASSERT_TRUE(streams().Stream_User(kTo, s, p, u));
+  tUser back;
+  p = 0;
+  ASSERT_TRUE(streams().Stream_User(kFrom, s, p, back));
+  EXPECT_EQ(back.USERID, u.USERID);
+  EXPECT_EQ(back.LastName, u.LastName);
+  EXPECT_EQ(back.RoleCode, u"\u00E9");
+
+  // A role code above U+00FF loses its high byte.
+  u.RoleCode = u"\u0141";
+  p = 0;
+  ASSERT_TRUE(streams().Stream_User(kTo, s, p, u));
+  p = 0;
+  ASSERT_TRUE(streams().Stream_User(kFrom, s, p, back));
+  EXPECT_EQ(back.RoleCode, u"\u0041");
+
+  tOrganization org{1, u"\u30E9\u30DC", 0, 0, u"\xDFFF", u"\u2713"};
+  ByteArray o(0, 132);
+  p = 0;
+  ASSERT_TRUE(streams().Stream_Organization(kTo, o, p, org));
+  tOrganization org_back;
+  p = 0;
+  ASSERT_TRUE(streams().Stream_Organization(kFrom, o, p, org_back));
+  EXPECT_EQ(org_back, org);
+}
+
+}  // namespace
+}  // namespace kvdata
