@@ -5,6 +5,8 @@
 #include <fstream>
 
 #include "spectra/bands.hpp"
+#include "spectra/cgats_reader.hpp"
+#include "spectra/cgats_writer.hpp"
 #include "spectra/csv_reader.hpp"
 #include "spectra/spectra_table.hpp"
 #include "support/errors.hpp"
@@ -150,6 +152,37 @@ TEST(Spectra, CgatsErrorsComeFromLittleCmsOrNameTheSet) {
   EXPECT_NE(error_of([&] { read_spectra((dir / "absent.csv").string()); }).find("cannot open"),
             std::string::npos);
   std::filesystem::remove_all(dir);
+}
+
+// Sample names found by fuzzing: a name with a no-break space (and no
+// blank), one with a tab, one starting like a number, one with
+// '#' or a single quote were written unquoted and made files that could not
+// be read back, or read back as other names.
+TEST(Spectra, CgatsWriterCellsReadBackAsWritten) {
+  const auto dir = std::filesystem::temp_directory_path() / "kvdata_cgats_writer_test";
+  std::filesystem::create_directories(dir);
+  const std::vector<std::string> names = {"Deep\xA0Grey", "a\tb",   "007", "1e5", "+5",       "#3",
+                                          "it's",         "Tile A", "B",   "-",   "\xE9t\xE9"};
+  std::vector<std::vector<std::string>> rows;
+  for (const std::string& name : names) rows.push_back({name, "2.5", "0.30000000000000004"});
+  const std::string text =
+      write_cgats("of \"x\"\nfile", {"SAMPLE_NAME", "SPECTRAL_NM360", "SPECTRAL_NM370"}, rows);
+  const auto path = (dir / "written.cgats").string();
+  std::ofstream(path, std::ios::binary) << text;
+  const SpectraTable t = read_cgats(path);
+  ASSERT_EQ(t.rows.size(), names.size());
+  for (std::size_t i = 0; i < names.size(); ++i) {
+    EXPECT_EQ(t.rows[i].name, names[i]) << i;
+    EXPECT_EQ(t.rows[i].values, (std::vector<double>{2.5, 0.30000000000000004})) << i;
+  }
+  std::filesystem::remove_all(dir);
+
+  // A double quote or a line break cannot be carried.
+  for (const std::string bad : {"say \"hi\"", "two\nlines", "cr\r"}) {
+    EXPECT_NE(error_of([&] { write_cgats("d", {"SAMPLE_NAME"}, {{bad}}); }).find("cannot write"),
+              std::string::npos)
+        << bad;
+  }
 }
 
 }  // namespace

@@ -15,7 +15,7 @@ CLI::Validator format_check(bool with_cgats) {
 std::string number_cell(Single value, const std::string& format, int decimals) {
   if (std::isnan(value)) return "NaN";
   if (std::isinf(value)) return value > 0 ? "Infinity" : "-Infinity";
-  if (format == "table") return fixed(value, decimals);
+  if (format == "table") return fixed(static_cast<double>(value), decimals);
   return shortest_text(value);
 }
 

@@ -1,9 +1,72 @@
 #include "spectra/cgats_writer.hpp"
 
+#include <cstdio>
+#include <cstdlib>
+
 #include "spectra/lcms_context.hpp"
 #include "support/errors.hpp"
 
 namespace kvdata::cli {
+namespace {
+
+// A cell that a CGATS reader takes back as this very text when it stands
+// unquoted: a word of printable ASCII without comment or quote characters
+// that does not start like a number.
+bool plain_word(const std::string& cell) {
+  if (cell.empty()) return false;
+  const char first = cell.front();
+  if ((first >= '0' && first <= '9') || first == '-' || first == '+' || first == '.') return false;
+  for (const char ch : cell) {
+    const auto c = static_cast<unsigned char>(ch);
+    if (c <= 32 || c >= 127 || c == '#' || c == '"' || c == '\'') return false;
+  }
+  return true;
+}
+
+// A number that reads back as the same text: the reader keeps numbers as
+// values and prints them again with ten significant digits.
+bool plain_number(const std::string& cell) {
+  if (cell.empty() || cell.size() > 40) return false;
+  for (const char c : cell) {
+    if (!((c >= '0' && c <= '9') || c == '.' || c == '-' || c == '+' || c == 'e' || c == 'E')) {
+      return false;
+    }
+  }
+  char* end = nullptr;
+  const double value = std::strtod(cell.c_str(), &end);
+  if (end != cell.c_str() + cell.size()) return false;
+  char again[64];
+  std::snprintf(again, sizeof again, "%.10g", value);
+  return cell == again;
+}
+
+// The cell as it must be handed to Little CMS so that the file reads back
+// as the same text. Little CMS quotes a cell only when it holds a blank, so
+// every other cell that would not read back as itself (an empty one, one
+// with a tab, a comment or quote character, a byte outside printable ASCII,
+// or one that reads as another number) is quoted here. A double quote or a
+// line break cannot be carried in any form: such a cell is refused.
+std::string cell_text(const std::string& cell) {
+  if (cell.find_first_of("\"\r\n", 0, 3) != std::string::npos ||
+      cell.find('\0') != std::string::npos) {
+    bad_input("cannot write \"" + cell +
+              "\" to a CGATS file: it holds a double quote or a line break");
+  }
+  if (plain_word(cell) || plain_number(cell) || cell.find(' ') != std::string::npos) return cell;
+  return "\"" + cell + "\"";
+}
+
+// A property text, always written in double quotes: quotes and line breaks
+// inside it become single quotes and blanks.
+std::string property_text(std::string text) {
+  for (char& c : text) {
+    if (c == '"') c = '\'';
+    if (c == '\r' || c == '\n') c = ' ';
+  }
+  return text;
+}
+
+}  // namespace
 
 std::string write_cgats(const std::string& descriptor, const std::vector<std::string>& fields,
                         const std::vector<std::vector<std::string>>& rows) {
@@ -14,7 +77,7 @@ std::string write_cgats(const std::string& descriptor, const std::vector<std::st
   bool ok =
       cmsIT8SetSheetType(it8.get(), "CGATS.17") &&
       cmsIT8SetPropertyStr(it8.get(), "ORIGINATOR", "kvdata") &&
-      cmsIT8SetPropertyStr(it8.get(), "DESCRIPTOR", descriptor.c_str()) &&
+      cmsIT8SetPropertyStr(it8.get(), "DESCRIPTOR", property_text(descriptor).c_str()) &&
       cmsIT8SetPropertyDbl(it8.get(), "NUMBER_OF_FIELDS", static_cast<double>(fields.size())) &&
       cmsIT8SetPropertyDbl(it8.get(), "NUMBER_OF_SETS", static_cast<double>(rows.size()));
   for (std::size_t f = 0; ok && f < fields.size(); ++f) {
@@ -23,7 +86,7 @@ std::string write_cgats(const std::string& descriptor, const std::vector<std::st
   for (std::size_t r = 0; ok && r < rows.size(); ++r) {
     for (std::size_t f = 0; ok && f < fields.size(); ++f) {
       ok = cmsIT8SetDataRowCol(it8.get(), static_cast<int>(r), static_cast<int>(f),
-                               rows[r][f].c_str());
+                               cell_text(rows[r][f]).c_str());
     }
   }
   cmsUInt32Number size = 0;

@@ -10,7 +10,11 @@
 namespace kvdata::cli {
 
 // `fields` are the DATA_FORMAT names, `rows` the sets (each as many cells as
-// fields). Texts with blanks are quoted by Little CMS.
+// fields). Every cell reads back from the file as the text given: cells that
+// would not (empty ones, ones with tabs, '#', quotes or bytes beyond ASCII,
+// or numbers the reader would print otherwise) are quoted. A cell holding a
+// double quote or a line break cannot be written: InputError. Quotes and
+// line breaks in the descriptor become single quotes and blanks.
 std::string write_cgats(const std::string& descriptor, const std::vector<std::string>& fields,
                         const std::vector<std::vector<std::string>>& rows);
 
