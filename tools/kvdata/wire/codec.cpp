@@ -2,7 +2,10 @@
 
 #include "json/fields.hpp"
 #include "kvdata/automation/error.hpp"
+#include "kvdata/automation/text.hpp"
 #include "support/errors.hpp"
+#include "support/library_log.hpp"
+#include "wire/codec_parts.hpp"
 
 namespace kvdata::cli {
 namespace codec {
@@ -22,6 +25,26 @@ std::vector<Byte> from_array(const ByteArray& a, Long from, Long to) {
 std::vector<Byte> whole_array(const ByteArray& a) {
   if (!a.has_bounds()) return {};
   return std::vector<Byte>(a.begin(), a.end());
+}
+
+void object_in(IKVStream& object, const ByteArray& a, const char* what,
+               const std::string& message) {
+  Long pos = 0;
+  LibraryLog log;
+  if (!object.StreamIn(a, pos)) {
+    bad_input(std::string("the library's ") + what + " reader refused the stream" +
+              (message.empty() ? std::string() : ": " + message) + log.summary());
+  }
+}
+
+std::vector<Byte> object_out(IKVStream& object, const char* what) {
+  ByteArray a(0, -1);
+  Long pos = 0;
+  LibraryLog log;
+  if (!object.StreamOut(a, pos)) {
+    bad_input(std::string("the library's ") + what + " writer refused the object" + log.summary());
+  }
+  return whole_array(a);
 }
 
 void check_width(const String& text, std::size_t units, const std::string& path) {

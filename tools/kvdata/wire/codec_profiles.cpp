@@ -13,29 +13,12 @@
 #include "support/errors.hpp"
 #include "support/library_log.hpp"
 #include "wire/codec.hpp"
+#include "wire/codec_parts.hpp"
 
 namespace kvdata::cli::codec {
 namespace {
 
 constexpr Single kCurrentVersion = 1.4f;
-
-void stream_in(IKVStream& object, const ByteArray& a, const char* what) {
-  Long pos = 0;
-  LibraryLog log;
-  if (!object.StreamIn(a, pos)) {
-    bad_input(std::string("the library's ") + what + " reader refused the stream" + log.summary());
-  }
-}
-
-std::vector<Byte> stream_out(IKVStream& object, const char* what) {
-  ByteArray a(0, -1);
-  Long pos = 0;
-  LibraryLog log;
-  if (!object.StreamOut(a, pos)) {
-    bad_input(std::string("the library's ") + what + " writer refused the object" + log.summary());
-  }
-  return whole_array(a);
-}
 
 // One correction table of the profile as {"SCE": [...], "SCI": [...]}.
 using Getter = Single (IKVProfile::*)(const eSC&, const Long&) const;
@@ -89,7 +72,7 @@ bool decode_profile_objects(StreamKind kind, const ByteArray& a, Json& doc) {
   switch (kind) {
     case StreamKind::Profile: {
       auto profile = KVProfile::create();
-      stream_in(*profile, a, "profile");
+      object_in(*profile, a, "profile");
       const IKVProfile& p = *profile;
       doc["ISN"] = string_to_json(p.ISN());
       doc["Created"] = date_to_json(p.Created());
@@ -102,7 +85,7 @@ bool decode_profile_objects(StreamKind kind, const ByteArray& a, Json& doc) {
     }
     case StreamKind::TestRun: {
       auto run = KVTestRun::create();
-      stream_in(*run, a, "test run");
+      object_in(*run, a, "test run");
       Single version = 0;
       String light_levels;
       testrun_extras(a, version, light_levels);
@@ -134,7 +117,7 @@ bool encode_profile_objects(StreamKind kind, const Json& doc, std::vector<Byte>&
       p.Interval(read_long(f.get("Interval"), f.at("Interval")));
       for (const Table& t : kTables) table_from_json(f, t.name, p, t.set);
       f.done();
-      out = stream_out(*profile, "profile");
+      out = object_out(*profile, "profile");
       return true;
     }
     case StreamKind::TestRun: {
@@ -160,7 +143,7 @@ bool encode_profile_objects(StreamKind kind, const Json& doc, std::vector<Byte>&
       }
       run->v1TestRun(record);
       run->LightLevelData(light_levels);
-      out = stream_out(*run, "test run");
+      out = object_out(*run, "test run");
       return true;
     }
     default:

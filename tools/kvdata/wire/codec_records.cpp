@@ -5,6 +5,7 @@
 #include "support/errors.hpp"
 #include "support/library_log.hpp"
 #include "wire/codec.hpp"
+#include "wire/codec_parts.hpp"
 
 namespace kvdata::cli::codec {
 namespace {
@@ -34,17 +35,6 @@ std::vector<Byte> write_with(const char* what, Long presize, Op op) {
   LibraryLog log;
   if (!op(a, pos)) refused(what, "writer refused the record", log);
   return from_array(a, 0, pos);
-}
-
-// The document's member `name` read into a record.
-template <class R>
-R member(const Json& doc, const char* name) {
-  Fields f(doc, "");
-  f.get("kind");
-  R r;
-  read_record(f.get(name), name, r);
-  f.done();
-  return r;
 }
 
 Streams& streams() {
@@ -122,7 +112,7 @@ bool decode_record_stream(StreamKind kind, const ByteArray& a, Json& doc) {
 bool encode_record_stream(StreamKind kind, const Json& doc, std::vector<Byte>& out) {
   switch (kind) {
     case StreamKind::SCPair: {
-      auto r = member<tSCPair>(doc, "SCP");
+      auto r = document_member<tSCPair>(doc, "SCP");
       out = write_with("SC pair", 0, [&](ByteArray& s, Long& p) {
         return streams().Stream_SCPair(kTo, s, p, r);
       });
@@ -145,7 +135,7 @@ bool encode_record_stream(StreamKind kind, const Json& doc, std::vector<Byte>& o
       return true;
     }
     case StreamKind::ProfileRecord: {
-      auto pro = member<tOVProfile>(doc, "pro");
+      auto pro = document_member<tOVProfile>(doc, "pro");
       if (pro.ProfileData.is_empty())
         bad_input("pro.ProfileData: the tables are needed to write a profile");
       out = write_with("profile record", 0, [&](ByteArray& s, Long& p) {
@@ -154,21 +144,21 @@ bool encode_record_stream(StreamKind kind, const Json& doc, std::vector<Byte>& o
       return true;
     }
     case StreamKind::Station: {
-      auto st = member<tStation>(doc, "Station");
+      auto st = document_member<tStation>(doc, "Station");
       out = write_with("station", 0, [&](ByteArray& s, Long& p) {
         return streams().Stream_Station(kTo, s, p, st);
       });
       return true;
     }
     case StreamKind::TestRunRecord: {
-      auto tr = member<tTestRun1>(doc, "TR");
+      auto tr = document_member<tTestRun1>(doc, "TR");
       out = write_with("test run record", 0, [&](ByteArray& s, Long& p) {
         return streams().Stream_TestRun(kTo, s, p, tr);
       });
       return true;
     }
     case StreamKind::UserBlock: {
-      auto user = member<tUser>(doc, "User");
+      auto user = document_member<tUser>(doc, "User");
       check_width(user.USERID, 8, "User.USERID");
       check_width(user.LastName, 30, "User.LastName");
       check_width(user.FirstName, 30, "User.FirstName");
@@ -186,7 +176,7 @@ bool encode_record_stream(StreamKind kind, const Json& doc, std::vector<Byte>& o
       return true;
     }
     case StreamKind::Organization: {
-      auto org = member<tOrganization>(doc, "Org");
+      auto org = document_member<tOrganization>(doc, "Org");
       check_width(org.Organization, 50, "Org.Organization");
       check_width(org.Alias, 8, "Org.Alias");
       check_width(org.Avail, 1, "Org.Avail");

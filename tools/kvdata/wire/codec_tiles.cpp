@@ -7,6 +7,7 @@
 #include "support/errors.hpp"
 #include "support/library_log.hpp"
 #include "wire/codec.hpp"
+#include "wire/codec_parts.hpp"
 
 namespace kvdata::cli::codec {
 namespace {
@@ -14,35 +15,6 @@ namespace {
 constexpr Long kTileCount = 13;
 constexpr std::size_t kNameUnits = 50;
 constexpr std::size_t kCalibrationTsnUnits = 8;
-
-void stream_in(IKVStream& object, const ByteArray& a, const char* what) {
-  Long pos = 0;
-  LibraryLog log;
-  if (!object.StreamIn(a, pos)) {
-    bad_input(std::string("the library's ") + what + " reader refused the stream" + log.summary());
-  }
-}
-
-std::vector<Byte> stream_out(IKVStream& object, const char* what) {
-  ByteArray a(0, -1);
-  Long pos = 0;
-  LibraryLog log;
-  if (!object.StreamOut(a, pos)) {
-    bad_input(std::string("the library's ") + what + " writer refused the object" + log.summary());
-  }
-  return whole_array(a);
-}
-
-// The document's single member `name`, read into a record.
-template <class R>
-R member(const Json& doc, const char* name) {
-  Fields f(doc, "");
-  f.get("kind");
-  R r;
-  read_record(f.get(name), name, r);
-  f.done();
-  return r;
-}
 
 // A tile set and a calibration always have 13 tiles: their readers read 13.
 template <class T>
@@ -61,19 +33,19 @@ bool decode_tile_objects(StreamKind kind, const ByteArray& a, Json& doc) {
   switch (kind) {
     case StreamKind::Tile: {
       auto tile = KVTile::create();
-      stream_in(*tile, a, "tile");
+      object_in(*tile, a, "tile");
       doc["v1Tile"] = write_record(tile->v1Tile());
       return true;
     }
     case StreamKind::TileSet: {
       auto set = KVTileSet::create();
-      stream_in(*set, a, "tile set");
+      object_in(*set, a, "tile set");
       doc["v1TileSet"] = write_record(set->v1TileSet());
       return true;
     }
     case StreamKind::Calibration: {
       auto cal = KVCalibration::create();
-      stream_in(*cal, a, "calibration");
+      object_in(*cal, a, "calibration");
       doc["v1Calibration"] = write_record(cal->v1Calibration());
       return true;
     }
@@ -85,15 +57,15 @@ bool decode_tile_objects(StreamKind kind, const ByteArray& a, Json& doc) {
 bool encode_tile_objects(StreamKind kind, const Json& doc, std::vector<Byte>& out) {
   switch (kind) {
     case StreamKind::Tile: {
-      const auto def = member<tTileDef>(doc, "v1Tile");
+      const auto def = document_member<tTileDef>(doc, "v1Tile");
       check_width(def.Name, kNameUnits, "v1Tile.Name");
       auto tile = KVTile::create();
       tile->v1Tile(def);
-      out = stream_out(*tile, "tile");
+      out = object_out(*tile, "tile");
       return true;
     }
     case StreamKind::TileSet: {
-      const auto ts = member<tTileSet>(doc, "v1TileSet");
+      const auto ts = document_member<tTileSet>(doc, "v1TileSet");
       check_thirteen(ts.Tiles, "v1TileSet.Tiles");
       for (Long i = 1; i <= kTileCount; ++i) {
         check_width(ts.Tiles(i).Name, kNameUnits,
@@ -101,16 +73,16 @@ bool encode_tile_objects(StreamKind kind, const Json& doc, std::vector<Byte>& ou
       }
       auto set = KVTileSet::create();
       set->v1TileSet(ts);
-      out = stream_out(*set, "tile set");
+      out = object_out(*set, "tile set");
       return true;
     }
     case StreamKind::Calibration: {
-      const auto tsc = member<tTileSetCalibration>(doc, "v1Calibration");
+      const auto tsc = document_member<tTileSetCalibration>(doc, "v1Calibration");
       check_width(tsc.TSN, kCalibrationTsnUnits, "v1Calibration.TSN");
       check_thirteen(tsc.Tiles, "v1Calibration.Tiles");
       auto cal = KVCalibration::create();
       cal->v1Calibration(tsc);
-      out = stream_out(*cal, "calibration");
+      out = object_out(*cal, "calibration");
       return true;
     }
     default:

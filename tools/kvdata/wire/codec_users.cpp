@@ -11,29 +11,10 @@
 #include "support/errors.hpp"
 #include "support/library_log.hpp"
 #include "wire/codec.hpp"
+#include "wire/codec_parts.hpp"
 
 namespace kvdata::cli::codec {
 namespace {
-
-// StreamIn from the first byte; false from the object is a refusal.
-void stream_in(IKVStream& object, const ByteArray& a, const char* what, const String& message) {
-  Long pos = 0;
-  LibraryLog log;
-  if (!object.StreamIn(a, pos)) {
-    bad_input(std::string("the library's ") + what + " reader refused the stream" +
-              (message.empty() ? std::string() : ": " + to_utf8(message)) + log.summary());
-  }
-}
-
-std::vector<Byte> stream_out(IKVStream& object, const char* what) {
-  ByteArray a(0, -1);
-  Long pos = 0;
-  LibraryLog log;
-  if (!object.StreamOut(a, pos)) {
-    bad_input(std::string("the library's ") + what + " writer refused the object" + log.summary());
-  }
-  return whole_array(a);
-}
 
 Json tolerance_to_json(const IKVTolerance& t) {
   Json j = Json::object();
@@ -84,14 +65,14 @@ bool decode_user_objects(StreamKind kind, const ByteArray& a, Json& doc) {
     }
     case StreamKind::Tolerance: {
       auto tol = KVTolerance::create();
-      stream_in(*tol, a, "tolerance", {});
+      object_in(*tol, a, "tolerance");
       const Json fields = tolerance_to_json(*tol);
       for (const auto& [key, value] : fields.items()) doc[key] = value;
       return true;
     }
     case StreamKind::TolSet: {
       auto set = KVTolSet::create();
-      stream_in(*set, a, "tolerance set", {});
+      object_in(*set, a, "tolerance set");
       IKVTolSet& s = *set;
       doc["ID"] = s.ID();
       doc["InstTypeID"] = s.InstTypeID();
@@ -138,7 +119,7 @@ bool encode_user_objects(StreamKind kind, const Json& doc, std::vector<Byte>& ou
       auto tol = KVTolerance::create();
       tolerance_from_json(f, *tol);
       f.done();
-      out = stream_out(*tol, "tolerance");
+      out = object_out(*tol, "tolerance");
       return true;
     }
     case StreamKind::TolSet: {
@@ -167,7 +148,7 @@ bool encode_user_objects(StreamKind kind, const Json& doc, std::vector<Byte>& ou
         }
       }
       f.done();
-      out = stream_out(*set, "tolerance set");
+      out = object_out(*set, "tolerance set");
       return true;
     }
     default:
