@@ -3,8 +3,6 @@
 // read back: names, wavelengths and values must come back (values to the
 // precision the writer prints). Every refusal must be an InputError.
 
-#include <unistd.h>
-
 #include <cmath>
 #include <cstdio>
 #include <cstdlib>
@@ -19,9 +17,8 @@ using namespace kvdata;
 
 namespace {
 
-std::string& directory() {
-  static std::string dir;
-  return dir;
+const std::string& directory() {
+  return fuzz::scratch_directory("kvdata-cgats", {"in.cgats", "again.cgats"});
 }
 
 void write_file(const std::string& path, const char* data, std::size_t size) {
@@ -46,17 +43,7 @@ bool close_enough(double a, double b) {
 
 extern "C" int LLVMFuzzerInitialize(int*, char***) {
   fuzz::quiet_event_log();
-  char shm_pattern[] = "/dev/shm/kvdata-cgats-XXXXXX";
-  char tmp_pattern[] = "/tmp/kvdata-cgats-XXXXXX";
-  const char* made = ::mkdtemp(shm_pattern);
-  if (made == nullptr) made = ::mkdtemp(tmp_pattern);
-  if (made == nullptr) std::abort();
-  directory() = made;
-  std::atexit([] {
-    std::remove((directory() + "/in.cgats").c_str());
-    std::remove((directory() + "/again.cgats").c_str());
-    ::rmdir(directory().c_str());
-  });
+  directory();
   return 0;
 }
 

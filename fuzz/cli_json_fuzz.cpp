@@ -2,8 +2,8 @@
 // told and its record or object encoded with the library's writers. Where
 // that succeeds, the stream is decoded back to JSON and encoded again: both
 // streams must be the same bytes, or, where the objects tidied a field on
-// reading, the second stream must come back unchanged from a further trip. Every refusal must be an InputError (or a
-// JSON parse error), never another exception or a crash.
+// reading, the second stream must come back unchanged from a further trip. Every refusal must be an
+// InputError (or a JSON parse error), never another exception or a crash.
 
 #include <string>
 

@@ -7,13 +7,17 @@
 //   kvdata::fuzz::Framed in = kvdata::fuzz::frame(data, size);
 //   KVDATA_FUZZ_CHECK(in.position_after_read_ok(end), "Position moved past the stream");
 
+#include <unistd.h>
+
 #include <cstddef>
 #include <cstdint>
 #include <cstdio>
 #include <cstdlib>
 #include <cstring>
+#include <initializer_list>
 #include <limits>
 #include <span>
+#include <string>
 #include <vector>
 
 #include "kvdata/kvdata.hpp"
@@ -172,6 +176,29 @@ inline ByteArray stream_of(const std::vector<Byte>& bytes) {
   ByteArray stream(0, static_cast<Long>(bytes.size()) - 1);
   if (!bytes.empty()) std::memcpy(stream.data(), bytes.data(), bytes.size());
   return stream;
+}
+
+// A private directory for targets that go through files, memory-backed when
+// the system has /dev/shm (every run writes files), made on first use; the
+// files named in `leaves` and the directory are removed when the run ends.
+// Returns the directory's path.
+inline const std::string& scratch_directory(const char* prefix,
+                                            std::initializer_list<const char*> leaves) {
+  static std::string dir;
+  static std::vector<std::string> files;
+  if (!dir.empty()) return dir;
+  std::string shm = std::string("/dev/shm/") + prefix + "-XXXXXX";
+  std::string tmp = std::string("/tmp/") + prefix + "-XXXXXX";
+  const char* made = ::mkdtemp(shm.data());
+  if (made == nullptr) made = ::mkdtemp(tmp.data());
+  if (made == nullptr) std::abort();
+  dir = made;
+  for (const char* leaf : leaves) files.push_back(dir + "/" + leaf);
+  std::atexit([] {
+    for (const std::string& file : files) std::remove(file.c_str());
+    ::rmdir(dir.c_str());
+  });
+  return dir;
 }
 
 }  // namespace kvdata::fuzz

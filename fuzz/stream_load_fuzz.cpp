@@ -5,8 +5,6 @@
 // readers that take any stream (tolerance set and user), which must stay
 // inside it.
 
-#include <unistd.h>
-
 #include <cstdio>
 #include <cstdlib>
 #include <string>
@@ -17,9 +15,8 @@ using namespace kvdata;
 
 namespace {
 
-std::string& directory() {
-  static std::string dir;
-  return dir;
+const std::string& directory() {
+  return fuzz::scratch_directory("kvdata-stream-load", {"in.bin", "out.bin"});
 }
 
 String file_name(const char* leaf) {
@@ -37,18 +34,7 @@ bool write_file(const String& name, const std::uint8_t* data, std::size_t size) 
 
 extern "C" int LLVMFuzzerInitialize(int*, char***) {
   fuzz::quiet_event_log();
-  // Memory-backed when the system has it: every run writes two files.
-  char shm_pattern[] = "/dev/shm/kvdata-stream-load-XXXXXX";
-  char tmp_pattern[] = "/tmp/kvdata-stream-load-XXXXXX";
-  const char* made = ::mkdtemp(shm_pattern);
-  if (made == nullptr) made = ::mkdtemp(tmp_pattern);
-  if (made == nullptr) std::abort();
-  directory() = made;
-  std::atexit([] {
-    std::remove((directory() + "/in.bin").c_str());
-    std::remove((directory() + "/out.bin").c_str());
-    ::rmdir(directory().c_str());
-  });
+  directory();
   return 0;
 }
 
