@@ -19,32 +19,14 @@ std::string reason(int err) {
 }
 
 std::string read_all(const std::string& path) {
-  const int fd = ::open(path.c_str(), O_RDONLY | O_CLOEXEC);
-  if (fd < 0) bad_input(path + ": cannot open: " + reason(errno));
-  struct stat st {};
-  if (::fstat(fd, &st) != 0) {
-    const int err = errno;
-    ::close(fd);
-    bad_input(path + ": cannot read: " + reason(err));
-  }
-  if (S_ISDIR(st.st_mode)) {
-    ::close(fd);
-    bad_input(path + ": is a directory, not a file");
-  }
+  InputFile file(path);
   std::string text;
   char buf[1 << 16];
   for (;;) {
-    const ssize_t n = ::read(fd, buf, sizeof buf);
+    const std::size_t n = file.read(buf, sizeof buf);
     if (n == 0) break;
-    if (n < 0) {
-      if (errno == EINTR) continue;
-      const int err = errno;
-      ::close(fd);
-      bad_input(path + ": read error: " + reason(err));
-    }
-    text.append(buf, static_cast<std::size_t>(n));
+    text.append(buf, n);
   }
-  ::close(fd);
   return text;
 }
 
@@ -56,6 +38,34 @@ mode_t new_file_mode() {
 }
 
 }  // namespace
+
+InputFile::InputFile(const std::string& path) : path_(path) {
+  fd_ = ::open(path.c_str(), O_RDONLY | O_CLOEXEC);
+  if (fd_ < 0) bad_input(path + ": cannot open: " + reason(errno));
+  struct stat st {};
+  if (::fstat(fd_, &st) != 0) {
+    const int err = errno;
+    ::close(fd_);
+    bad_input(path + ": cannot read: " + reason(err));
+  }
+  if (S_ISDIR(st.st_mode)) {
+    ::close(fd_);
+    bad_input(path + ": is a directory, not a file");
+  }
+  if (S_ISREG(st.st_mode)) size_ = static_cast<std::size_t>(st.st_size);
+}
+
+InputFile::~InputFile() {
+  ::close(fd_);
+}
+
+std::size_t InputFile::read(char* to, std::size_t room) {
+  for (;;) {
+    const ssize_t n = ::read(fd_, to, room);
+    if (n >= 0) return static_cast<std::size_t>(n);
+    if (errno != EINTR) bad_input(path_ + ": read error: " + reason(errno));
+  }
+}
 
 std::vector<Byte> read_bytes(const std::string& path) {
   const std::string text = read_all(path);
