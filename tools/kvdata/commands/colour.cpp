@@ -6,7 +6,6 @@
 // CSV and JSON results go out block by block; the aligned table and CGATS
 // start with figures known only at the end (the count, the column widths),
 // so their rows are set aside in a spool and written behind the head.
-#include <charconv>
 #include <cmath>
 #include <cstring>
 #include <iostream>
@@ -53,22 +52,6 @@ struct BlockResults {
   std::size_t count() const { return samples->count; }
 };
 
-// Appends a number as number_cell writes it: fixed decimals for the table,
-// the shortest exact text otherwise.
-void append_number(std::string& out, Single value, bool table) {
-  if (std::isnan(value)) {
-    out += "NaN";
-  } else if (std::isinf(value)) {
-    out += value > 0 ? "Infinity" : "-Infinity";
-  } else if (table) {
-    out += fixed(static_cast<double>(value), 3);
-  } else {
-    char buf[64];
-    const auto r = std::to_chars(buf, buf + sizeof buf, value);
-    out.append(buf, r.ptr);
-  }
-}
-
 // The cells of result row i after the label: X Y Z L* a* b* [reference dL* da* db* dE*ab].
 template <class Cell, class Text>
 void for_each_cell(const BlockResults& r, std::size_t i, Cell number, Text text) {
@@ -103,7 +86,7 @@ class CsvWriter : public ResultWriter {
           r, i,
           [&](Single v) {
             text_ += ',';
-            append_number(text_, v, false);
+            append_number_cell(text_, v, false, 3);
           },
           [&](const std::string& s) {
             text_ += ',';
@@ -199,7 +182,7 @@ class TableWriter : public ResultWriter {
           r, i,
           [&](Single v) {
             cell.clear();
-            append_number(cell, v, true);
+            append_number_cell(cell, v, true, 3);
             put(cell);
           },
           put);
@@ -274,7 +257,7 @@ class CgatsWriter : public ResultWriter {
           r, i,
           [&](Single v) {
             cells_.emplace_back();
-            append_number(cells_.back(), v, false);
+            append_number_cell(cells_.back(), v, false, 3);
           },
           [](const std::string&) {});
       append_cgats_set(text_, cells_);
