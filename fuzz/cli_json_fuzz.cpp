@@ -1,7 +1,8 @@
 // The kvdata command's JSON reader (encode): fuzzed text is parsed, its kind
 // told and its record or object encoded with the library's writers. Where
 // that succeeds, the stream is decoded back to JSON and encoded again: both
-// streams must be the same bytes. Every refusal must be an InputError (or a
+// streams must be the same bytes, or, where the objects tidied a field on
+// reading, the second stream must come back unchanged from a further trip. Every refusal must be an InputError (or a
 // JSON parse error), never another exception or a crash.
 
 #include <string>
@@ -22,8 +23,8 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
   cli::Json doc;
   try {
     doc = cli::Json::parse(text);
-  } catch (const cli::Json::parse_error&) {
-    return 0;
+  } catch (const cli::Json::exception&) {
+    return 0;  // what the command reports as "not valid JSON"
   }
   std::vector<Byte> first;
   cli::StreamKind kind{};
@@ -44,6 +45,17 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     std::fprintf(stderr, "%s\n", e.what());
     KVDATA_FUZZ_CHECK(false, "a stream the command wrote cannot be read back and written again");
   }
-  KVDATA_FUZZ_CHECK(first == second, "a document changed on its round trip through its stream");
+  if (first == second) return 0;
+  // The objects tidy some fields as they read them (a name loses its leading
+  // blanks), which `decode` warns about; the tidied stream must then be a
+  // fixed point: it decodes to the same document and encodes to itself.
+  std::vector<Byte> third;
+  try {
+    third = cli::encode_stream(kind, cli::decode_stream(kind, second));
+  } catch (const std::exception& e) {
+    std::fprintf(stderr, "%s\n", e.what());
+    KVDATA_FUZZ_CHECK(false, "a tidied stream cannot be read back and written again");
+  }
+  KVDATA_FUZZ_CHECK(third == second, "a document changed on its round trip through its stream");
   return 0;
 }

@@ -220,6 +220,13 @@ TEST(CommandStreams, UnknownStreamsAskForKindAndBadDocumentsNameTheField) {
   EXPECT_EQ(p.code, 1);
   EXPECT_NE(p.err.find("not valid JSON"), std::string::npos);
   EXPECT_FALSE(std::filesystem::exists(s.path("x.kvs")));
+  // A number beyond the range of a double is refused the same way, not as an
+  // internal failure.
+  spill(s.path("huge.json"), "{\"kind\": \"station\", \"x\": 5E821}");
+  const auto h = kvdata({"encode", s.path("huge.json"), "-o", s.path("x.kvs")});
+  EXPECT_EQ(h.code, 1);
+  EXPECT_NE(h.err.find(s.path("huge.json") + ": not valid JSON"), std::string::npos) << h.err;
+  EXPECT_FALSE(std::filesystem::exists(s.path("x.kvs")));
 }
 
 TEST(CommandStreams, DecodeWarnsWhenTheJsonWouldNotGiveBackTheSameBytes) {

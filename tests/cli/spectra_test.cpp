@@ -149,6 +149,13 @@ TEST(Spectra, CgatsErrorsComeFromLittleCmsOrNameTheSet) {
       write("broken.cgats", "CGATS.17\nBEGIN_DATA_FORMAT\nA B\nEND_DATA_FORMAT\nBEGIN_DATA\n1 2\n");
   EXPECT_NE(error_of([&] { read_spectra(broken); }).find(broken + ": not a readable CGATS file"),
             std::string::npos);
+  // No data-format section: Little CMS has no list of field names (found by fuzzing).
+  const std::string no_format =
+      write("no-format.cgats",
+            "CGATS.17\nNUMBER_OF_FIELDS 2\nNUMBER_OF_SETS 1\nBEGIN_DATA\nA 2.5\nEND_DATA\n");
+  EXPECT_NE(error_of([&] { read_cgats(no_format); }).find(no_format + ": no spectral fields"),
+            std::string::npos)
+      << error_of([&] { read_cgats(no_format); });
   EXPECT_NE(error_of([&] { read_spectra((dir / "absent.csv").string()); }).find("cannot open"),
             std::string::npos);
   std::filesystem::remove_all(dir);
@@ -165,20 +172,26 @@ TEST(Spectra, CgatsWriterCellsReadBackAsWritten) {
                                           "it's",         "Tile A", "B",   "-",   "\xE9t\xE9"};
   std::vector<std::vector<std::string>> rows;
   for (const std::string& name : names) rows.push_back({name, "2.5", "0.30000000000000004"});
+  // Numbers that Little CMS would read as words: an exponent and no decimal point.
+  rows.push_back({"small", "1e-05", "-2e+102"});
   const std::string text =
       write_cgats("of \"x\"\nfile", {"SAMPLE_NAME", "SPECTRAL_NM360", "SPECTRAL_NM370"}, rows);
   const auto path = (dir / "written.cgats").string();
   std::ofstream(path, std::ios::binary) << text;
   const SpectraTable t = read_cgats(path);
-  ASSERT_EQ(t.rows.size(), names.size());
+  ASSERT_EQ(t.rows.size(), names.size() + 1);
   for (std::size_t i = 0; i < names.size(); ++i) {
     EXPECT_EQ(t.rows[i].name, names[i]) << i;
     EXPECT_EQ(t.rows[i].values, (std::vector<double>{2.5, 0.30000000000000004})) << i;
   }
+  EXPECT_EQ(t.rows.back().name, "small");
+  EXPECT_EQ(t.rows.back().values, (std::vector<double>{1e-05, -2e+102}));
+  EXPECT_NE(text.find("1.0e-05"), std::string::npos);
   std::filesystem::remove_all(dir);
 
-  // A double quote or a line break cannot be carried.
-  for (const std::string bad : {"say \"hi\"", "two\nlines", "cr\r"}) {
+  // A double quote, a line break or an empty cell cannot be carried (an empty
+  // quoted cell reads back as the text before it).
+  for (const std::string bad : {"say \"hi\"", "two\nlines", "cr\r", ""}) {
     EXPECT_NE(error_of([&] { write_cgats("d", {"SAMPLE_NAME"}, {{bad}}); }).find("cannot write"),
               std::string::npos)
         << bad;

@@ -19,7 +19,9 @@ void run_encode(const EncodeOptions& o) {
   Json doc;
   try {
     doc = Json::parse(text);
-  } catch (const Json::parse_error& e) {
+  } catch (const Json::exception& e) {
+    // Syntax errors, and also numbers beyond the range of a double ("1E400"),
+    // which the parser reports as out of range rather than as a parse error.
     bad_input(file + ": not valid JSON: " + e.what());
   }
   std::vector<Byte> bytes;

@@ -2,6 +2,7 @@
 
 #include <charconv>
 #include <cmath>
+#include <limits>
 #include <optional>
 #include <string_view>
 
@@ -40,7 +41,9 @@ SpectraTable read_cgats(const std::string& path) {
   if (cmsIT8TableCount(it8.get()) > 1) cmsIT8SetTable(it8.get(), 0);
 
   char** names = nullptr;
-  const int fields = cmsIT8EnumDataFormat(it8.get(), &names);
+  int fields = cmsIT8EnumDataFormat(it8.get(), &names);
+  // A table without a BEGIN_DATA_FORMAT section has a count but no names.
+  if (names == nullptr) fields = 0;
   std::vector<int> spectral;
   int name_field = -1;
   int id_field = -1;
@@ -65,7 +68,9 @@ SpectraTable read_cgats(const std::string& path) {
 
   const char* sets_text = cmsIT8GetProperty(it8.get(), "NUMBER_OF_SETS");
   const auto sets = number(sets_text);
-  if (!sets || *sets < 0) bad_input(path + ": NUMBER_OF_SETS is missing or not a number");
+  if (!sets || *sets < 0 || *sets > std::numeric_limits<int>::max()) {
+    bad_input(path + ": NUMBER_OF_SETS is missing or not a number of sets");
+  }
   const auto count = static_cast<int>(*sets);
 
   Progress progress("reading " + path, static_cast<std::size_t>(count));

@@ -42,17 +42,29 @@ bool plain_number(const std::string& cell) {
 
 // The cell as it must be handed to Little CMS so that the file reads back
 // as the same text. Little CMS quotes a cell only when it holds a blank, so
-// every other cell that would not read back as itself (an empty one, one
-// with a tab, a comment or quote character, a byte outside printable ASCII,
-// or one that reads as another number) is quoted here. A double quote or a
-// line break cannot be carried in any form: such a cell is refused.
+// every other cell that would not read back as itself (one with a tab, a comment or quote
+// character, a byte outside printable ASCII, or one that reads as another number) is quoted here. A
+// double quote or a line break cannot be carried in any form, nor can an empty cell (Little CMS
+// reads an empty quoted string as the text read before it): such a cell is
+// refused.
 std::string cell_text(const std::string& cell) {
+  if (cell.empty()) bad_input("cannot write an empty cell to a CGATS file");
   if (cell.find_first_of("\"\r\n", 0, 3) != std::string::npos ||
       cell.find('\0') != std::string::npos) {
     bad_input("cannot write \"" + cell +
               "\" to a CGATS file: it holds a double quote or a line break");
   }
-  if (plain_word(cell) || plain_number(cell) || cell.find(' ') != std::string::npos) return cell;
+  if (plain_number(cell)) {
+    // Little CMS takes a number with an exponent but no decimal point
+    // ("1e-05") for a word and joins it to the text read before it, so the
+    // mantissa gets a decimal point ("1.0e-05"): the same value, still a number.
+    const std::size_t exponent = cell.find_first_of("eE");
+    if (exponent != std::string::npos && cell.find('.') == std::string::npos) {
+      return cell.substr(0, exponent) + ".0" + cell.substr(exponent);
+    }
+    return cell;
+  }
+  if (plain_word(cell) || cell.find(' ') != std::string::npos) return cell;
   return "\"" + cell + "\"";
 }
 
