@@ -142,13 +142,13 @@ TEST(StreamingParts, NumbersReadAsFromChars) {
 
 TEST(StreamingParts, CgatsInPiecesAsWhole) {
   const std::vector<std::string> fields = {"SAMPLE_ID", "SAMPLE_NAME", "XYZ_X", "LAB_L"};
-  const std::vector<std::string> names = {"Deep\xA0Grey", "a\tb", "007",    "1e5", "+5",
-                                          "#3",           "it's", "Tile A", "B",   "-",
-                                          "\xE9t\xE9",    "",     "line 7"};
+  const std::vector<std::string> names = {"Deep\xA0Grey", "a\tb",   "007",    "1e5", "+5",
+                                          "#3",           "it's",   "Tile A", "B",   "-",
+                                          "\xE9t\xE9",    "line 7", "1e-05"};
   std::vector<std::vector<std::string>> rows;
   for (std::size_t i = 0; i < 2000; ++i) {
     rows.push_back({std::to_string(i + 1), names[i % names.size()], "0.30000000000000004",
-                    i % 2 ? "NaN" : "-12.5"});
+                    i % 2 ? "NaN" : "1e-05"});
   }
   std::string pieces = cgats_head("of \"x\"\nfile", fields, rows.size());
   for (const auto& row : rows) append_cgats_set(pieces, row);
