@@ -2,7 +2,10 @@
 # Builds the release preset, runs the benchmark suite and the end-to-end
 # measurement of `kvdata colour`, and writes bench/RESULTS.md: every figure
 # with the machine it ran on, and every ratio to its limit or peer, all from
-# this one run.
+# this one run. The command runs on KVDATA_BENCH_SPECTRA spectra and on a
+# tenth of that (peak memory must not grow), and its CPU time is split into
+# reading, colour work and writing with the suite's command/csv/* phases.
+# bench/NOTES.md (the profiles behind the figures) is appended.
 #
 #   ./scripts/run-benchmarks.sh                      # 5 repetitions, 1 000 000 spectra
 #   KVDATA_BENCH_REPETITIONS=9 ./scripts/run-benchmarks.sh
