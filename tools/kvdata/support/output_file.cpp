@@ -23,9 +23,10 @@ mode_t new_file_mode() {
 
 }  // namespace
 
-OutputFile::OutputFile(const std::string& path) {
+OutputFile::OutputFile(const std::string& path, bool dash_is_stdout) {
+  if (!dash_is_stdout && path.empty()) bad_usage("an output file name is empty");
   buffer_.reserve(kBufferBytes);
-  if (path.empty() || path == "-") {
+  if (dash_is_stdout && (path.empty() || path == "-")) {
     fd_ = STDOUT_FILENO;
     return;
   }
@@ -52,22 +53,33 @@ void OutputFile::fail(const std::string& what, int err) {
 }
 
 void OutputFile::write(std::string_view text) {
-  if (buffer_.size() + text.size() > kBufferBytes) flush();
-  buffer_.append(text);
-  if (buffer_.size() >= kBufferBytes) flush();
+  if (buffer_.size() + text.size() <= kBufferBytes) {
+    buffer_.append(text);
+    return;
+  }
+  flush();
+  if (text.size() >= kBufferBytes) {
+    write_all(text);  // large pieces go out without a copy
+  } else {
+    buffer_.append(text);
+  }
 }
 
 void OutputFile::flush() {
+  write_all(buffer_);
+  buffer_.clear();
+}
+
+void OutputFile::write_all(std::string_view bytes) {
   std::size_t done = 0;
-  while (done < buffer_.size()) {
-    const ssize_t n = ::write(fd_, buffer_.data() + done, buffer_.size() - done);
+  while (done < bytes.size()) {
+    const ssize_t n = ::write(fd_, bytes.data() + done, bytes.size() - done);
     if (n < 0) {
       if (errno == EINTR) continue;
       fail("write failed", errno);
     }
     done += static_cast<std::size_t>(n);
   }
-  buffer_.clear();
 }
 
 void OutputFile::commit() {

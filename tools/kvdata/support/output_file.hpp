@@ -18,8 +18,9 @@ namespace kvdata::cli {
 class OutputFile {
  public:
   // Opens the temporary file beside `path` (InputError naming the target when
-  // it cannot be made), or standard output.
-  explicit OutputFile(const std::string& path);
+  // it cannot be made), or standard output for "" or "-" when
+  // `dash_is_stdout`; otherwise "-" is a file of that name and "" bad usage.
+  explicit OutputFile(const std::string& path, bool dash_is_stdout = true);
   ~OutputFile();
   OutputFile(const OutputFile&) = delete;
   OutputFile& operator=(const OutputFile&) = delete;
@@ -33,6 +34,7 @@ class OutputFile {
 
  private:
   void flush();
+  void write_all(std::string_view bytes);
   [[noreturn]] void fail(const std::string& what, int err);
 
   std::string path_;  // empty: standard output
