@@ -2,7 +2,10 @@
 # Builds the release preset, runs the benchmark suite and the end-to-end
 # measurement of `kvdata colour`, and writes bench/RESULTS.md: every figure
 # with the machine it ran on, and every ratio to its limit or peer, all from
-# this one run.
+# this one run. The command runs on KVDATA_BENCH_SPECTRA spectra and on a
+# tenth of that (peak memory must not grow), and its CPU time is split into
+# reading, colour work and writing with the suite's command/csv/* phases.
+# bench/NOTES.md (the profiles behind the figures) is appended.
 #
 #   ./scripts/run-benchmarks.sh                      # 5 repetitions, 1 000 000 spectra
 #   KVDATA_BENCH_REPETITIONS=9 ./scripts/run-benchmarks.sh
@@ -60,7 +63,10 @@ field() {
 }
 has() { [ -n "$(field "$1" 2)" ]; }
 # ratio A B: cpu time of A over cpu time of B, two decimals.
-ratio() { awk -v a="$(field "$1" 2)" -v b="$(field "$2" 2)" 'BEGIN { printf "%.2f", a / b }'; }
+ratio() {
+  awk -v a="$(field "$1" 2)" -v b="$(field "$2" 2)" \
+    'BEGIN { if (a == "" || b == "" || b == 0) print "n/a"; else printf "%.2f", a / b }'
+}
 gbps() { awk -v v="$(field "$1" 4)" 'BEGIN { printf "%.2f", v / 1e9 }'; }
 mps() { awk -v v="$(field "$1" 5)" 'BEGIN { printf "%.2f", v / 1e6 }'; }
 usec() { awk -v v="$(field "$1" 2)" 'BEGIN { printf "%.1f", v / 1e3 }'; }
@@ -123,6 +129,31 @@ if [ -x "$kvdata_bin" ] && "$kvdata_bin" colour --help >/dev/null 2>&1; then
   rss_large=$(eval echo "\$rss_$spectra")
   cpu_large=$(eval echo "\$cpu_$spectra")
   rss_growth=$(awk -v a="$rss_small" -v b="$rss_large" 'BEGIN { printf "%.1f", b / a }')
+  # Where the command's CPU time goes: each phase's CPU per spectrum from the
+  # suite (measured on 100 000 spectra in this run) against the whole
+  # process's CPU per spectrum at the larger size.
+  phase_rows=""
+  phase_sum=0
+  command_ns=$(awk -v n="$spectra" -v c="$cpu_large" 'BEGIN { printf "%.0f", 1e9 * c / n }')
+  phase() {  # phase BENCHMARK TEXT [counted]: one row; counted phases add up to the sum
+    local per share
+    has "$1" || return 0
+    per=$(awk -v r="$(field "$1" 5)" 'BEGIN { printf "%.0f", (r > 0) ? 1e9 / r : 0 }')
+    share=$(awk -v p="$per" -v c="$command_ns" 'BEGIN { printf "%.1f", (c > 0) ? 100 * p / c : 0 }')
+    phase_rows+="| $2 | \`$1\` | $per | $share % |"$'\n'
+    if [ "${3:-}" = counted ]; then phase_sum=$((phase_sum + per)); fi
+    eval "share_${1//[^a-z]/_}=$share"
+  }
+  phase command/csv/read_bytes "reading the file's bytes (part of the next line)"
+  phase command/csv/read_spectra "reading: the bytes, the CSV records, the numbers onto the bands" counted
+  phase colour/spectra/batch "colour work: XYZ and CIELAB with the batch entry point" counted
+  phase command/csv/write_results "writing: the results as CSV text" counted
+  if [ -n "$phase_rows" ]; then
+    rest=$((command_ns - phase_sum))
+    rest_share=$(awk -v p="$rest" -v c="$command_ns" 'BEGIN { printf "%.1f", (c > 0) ? 100 * p / c : 0 }')
+    phase_rows+="| the rest: writing to the file and flushing it, start-up, page faults | | $rest | $rest_share % |"$'\n'
+    phase_rows+="| the whole process (CPU time at $spectra spectra / $spectra) | | $command_ns | 100 % |"$'\n'
+  fi
   if has colour/spectra/batch; then
     colour_share=$(awk -v n="$spectra" -v r="$(field colour/spectra/batch 5)" -v c="$cpu_large" \
       'BEGIN { printf "%.1f", 100 * (n / r) / c }')
@@ -253,12 +284,31 @@ host_wall_ratio="$(jq -r 'map(.real_time / .cpu_time) | add / length' "$work/med
     echo "|---|---|---|---|---|---|---|---|"
     printf '%s' "$e2e_rows"
     echo
-    echo "- Peak memory at $spectra spectra is $rss_growth times that at $small_spectra (a streaming"
-    echo "  command stays near 1)."
-    if [ -n "$colour_share" ]; then
+    echo "- Peak memory at $spectra spectra is $rss_growth times that at $small_spectra (target: it does"
+    echo "  not grow with the number of spectra; $(verdict "$rss_growth" 1.5))."
+    if [ -n "$phase_rows" ]; then
+      echo
+      echo "Where the CPU time goes, per spectrum: each phase on its own in the suite (100 000"
+      echo "spectra, median of the run), as a share of the whole process's CPU per spectrum at"
+      echo "$spectra spectra."
+      echo
+      echo "| phase | benchmark | ns per spectrum | share of the command |"
+      echo "|---|---|---|---|"
+      printf '%s' "$phase_rows"
+      echo
+      read_share="${share_command_csv_read_spectra:-0}"
+      colour_part="${share_colour_spectra_batch:-0}"
+      echo "- Reading is $read_share % of the command's CPU time, the colour work $colour_part % (target: the"
+      echo "  command is dominated by reading the file, not by the colour work; $(verdict "$colour_part" "$read_share")). Reading"
+      echo "  over colour work: $(awk -v a="$read_share" -v b="$colour_part" 'BEGIN { if (b > 0) printf "%.1f", a / b; else printf "n/a" }') times."
+    elif [ -n "$colour_share" ]; then
       echo "- The colour work (the batch rate above applied to $spectra spectra) is $colour_share % of"
       echo "  the command's CPU time; the rest is reading, parsing and writing."
     fi
+  fi
+  if [ -f bench/NOTES.md ]; then
+    echo
+    cat bench/NOTES.md
   fi
 } >"$results"
 

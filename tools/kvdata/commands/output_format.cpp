@@ -1,5 +1,6 @@
 #include "commands/output_format.hpp"
 
+#include <charconv>
 #include <cmath>
 
 #include "json/numbers.hpp"
@@ -17,6 +18,20 @@ std::string number_cell(Single value, const std::string& format, int decimals) {
   if (std::isinf(value)) return value > 0 ? "Infinity" : "-Infinity";
   if (format == "table") return fixed(static_cast<double>(value), decimals);
   return shortest_text(value);
+}
+
+void append_number_cell(std::string& out, Single value, bool table, int decimals) {
+  if (std::isnan(value)) {
+    out += "NaN";
+  } else if (std::isinf(value)) {
+    out += value > 0 ? "Infinity" : "-Infinity";
+  } else if (table) {
+    out += fixed(static_cast<double>(value), decimals);
+  } else {
+    char buf[64];
+    const auto r = std::to_chars(buf, buf + sizeof buf, value);
+    out.append(buf, r.ptr);
+  }
 }
 
 }  // namespace kvdata::cli

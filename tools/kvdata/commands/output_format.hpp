@@ -21,4 +21,8 @@ CLI::Validator format_check(bool with_cgats);
 // exact text); NaN as "NaN".
 std::string number_cell(Single value, const std::string& format, int decimals);
 
+// The same text appended to `out`, without a string of its own: `table`
+// for the table's fixed decimals, otherwise the shortest exact text.
+void append_number_cell(std::string& out, Single value, bool table, int decimals);
+
 }  // namespace kvdata::cli

@@ -1,5 +1,6 @@
 #include "spectra/bands.hpp"
 
+#include <algorithm>
 #include <cmath>
 #include <cstdio>
 #include <optional>
@@ -41,13 +42,14 @@ std::string coverage(const std::vector<double>& wl) {
   return text + " (" + std::to_string(wl.size()) + " wavelengths)";
 }
 
-std::vector<tSpectrum> to_bands(const SpectraTable& table, bool extend) {
+std::array<std::size_t, 40> band_columns(const std::string& file,
+                                         const std::vector<double>& wavelengths, bool extend) {
   // Column of each band, or none.
   std::optional<std::size_t> column[41];
   int first = 0;
   int last = 0;
   for (int band = 1; band <= 40; ++band) {
-    column[band] = column_at(table.wavelengths, kFirstNm + kStepNm * (band - 1));
+    column[band] = column_at(wavelengths, kFirstNm + kStepNm * (band - 1));
     if (column[band]) {
       if (first == 0) first = band;
       last = band;
@@ -62,8 +64,10 @@ std::vector<tSpectrum> to_bands(const SpectraTable& table, bool extend) {
     inner_gap = inner_gap || (first != 0 && band > first && band < last);
   }
   if (!missing.empty() && (!extend || inner_gap || first == 0)) {
+    std::vector<double> ordered = wavelengths;
+    std::sort(ordered.begin(), ordered.end());
     std::string message =
-        table.file + ": the spectra cover " + coverage(table.wavelengths) +
+        file + ": the spectra cover " + coverage(ordered) +
         "; the 40 bands from 360 to 750 nm at 10 nm are needed (missing: " + missing + " nm).";
     if (inner_gap || first == 0) {
       message += " Bands missing inside the range cannot be filled.";
@@ -72,13 +76,22 @@ std::vector<tSpectrum> to_bands(const SpectraTable& table, bool extend) {
     }
     bad_input(message);
   }
+  std::array<std::size_t, 40> columns{};
+  for (int band = 1; band <= 40; ++band) {
+    const int from = band < first ? first : band > last ? last : band;
+    columns[static_cast<std::size_t>(band - 1)] = *column[from];
+  }
+  return columns;
+}
+
+std::vector<tSpectrum> to_bands(const SpectraTable& table, bool extend) {
+  const std::array<std::size_t, 40> columns = band_columns(table.file, table.wavelengths, extend);
   std::vector<tSpectrum> spectra;
   spectra.reserve(table.rows.size());
   for (const SpectrumRow& row : table.rows) {
     tSpectrum s;
     for (int band = 1; band <= 40; ++band) {
-      const int from = band < first ? first : band > last ? last : band;
-      s.Data(band) = static_cast<Single>(row.values[*column[from]]);
+      s.Data(band) = static_cast<Single>(row.values[columns[static_cast<std::size_t>(band - 1)]]);
     }
     spectra.push_back(s);
   }

@@ -9,6 +9,8 @@
 //
 //   std::vector<tSpectrum> s = to_bands(read_spectra("white.csv"), /*extend=*/true);
 
+#include <array>
+#include <cstddef>
 #include <string>
 #include <vector>
 
@@ -19,6 +21,12 @@ namespace kvdata::cli {
 
 // "380 to 730 nm at 10 nm (36 wavelengths)".
 std::string coverage(const std::vector<double>& wavelengths);
+
+// For bands 1 to 40 (index 0 to 39), the index in `wavelengths` (any order,
+// no repeats) of the column whose value the band takes. InputError naming
+// `file` when the wavelengths do not cover the bands.
+std::array<std::size_t, 40> band_columns(const std::string& file,
+                                         const std::vector<double>& wavelengths, bool extend);
 
 // One tSpectrum per row, values rounded to Single.
 std::vector<tSpectrum> to_bands(const SpectraTable& table, bool extend);

@@ -80,6 +80,43 @@ std::string property_text(std::string text) {
 
 }  // namespace
 
+// Little CMS puts a cell holding a blank between double quotes.
+void append_cgats_cell(std::string& out, const std::string& cell) {
+  const std::string text = cell_text(cell);
+  if (text.find(' ') != std::string::npos) {
+    out += '"';
+    out += text;
+    out += '"';
+  } else {
+    out += text;
+  }
+}
+
+std::string cgats_head(const std::string& descriptor, const std::vector<std::string>& fields,
+                       std::size_t sets) {
+  LcmsContext context;
+  It8Handle it8(context.get() == nullptr ? nullptr : cmsIT8Alloc(context.get()));
+  auto fail = [&] { bad_input("cannot write CGATS: " + context.messages()); };
+  if (!it8) fail();
+  bool ok =
+      cmsIT8SetSheetType(it8.get(), "CGATS.17") &&
+      cmsIT8SetPropertyStr(it8.get(), "ORIGINATOR", "kvdata") &&
+      cmsIT8SetPropertyStr(it8.get(), "DESCRIPTOR", property_text(descriptor).c_str()) &&
+      cmsIT8SetPropertyDbl(it8.get(), "NUMBER_OF_FIELDS", static_cast<double>(fields.size())) &&
+      cmsIT8SetPropertyDbl(it8.get(), "NUMBER_OF_SETS", static_cast<double>(sets));
+  for (std::size_t f = 0; ok && f < fields.size(); ++f) {
+    ok = cmsIT8SetDataFormat(it8.get(), static_cast<int>(f), fields[f].c_str());
+  }
+  // Without sets Little CMS writes the properties and the data format only.
+  cmsUInt32Number size = 0;
+  if (!ok || !cmsIT8SaveToMem(it8.get(), nullptr, &size)) fail();
+  std::string text(size, '\0');
+  if (!cmsIT8SaveToMem(it8.get(), text.data(), &size)) fail();
+  text.resize(size);
+  while (!text.empty() && text.back() == '\0') text.pop_back();
+  return text + "BEGIN_DATA\n";
+}
+
 std::string write_cgats(const std::string& descriptor, const std::vector<std::string>& fields,
                         const std::vector<std::vector<std::string>>& rows) {
   LcmsContext context;

@@ -4,6 +4,7 @@
 //
 //   std::string text = write_cgats("colour of white.csv", {"SAMPLE_ID", "LAB_L"}, rows);
 
+#include <cstddef>
 #include <string>
 #include <vector>
 
@@ -17,5 +18,30 @@ namespace kvdata::cli {
 // line breaks in the descriptor become single quotes and blanks.
 std::string write_cgats(const std::string& descriptor, const std::vector<std::string>& fields,
                         const std::vector<std::vector<std::string>>& rows);
+
+// The same file written in pieces, for more sets than are worth holding at
+// once: cgats_head() (the properties, NUMBER_OF_SETS `sets`, the data format
+// and BEGIN_DATA), then append_cgats_set() for each set, then kCgatsTail.
+// Together they are the bytes write_cgats gives for the same sets.
+std::string cgats_head(const std::string& descriptor, const std::vector<std::string>& fields,
+                       std::size_t sets);
+template <class Cells>
+void append_cgats_set(std::string& out, const Cells& cells);
+inline constexpr const char* kCgatsTail = "END_DATA\n";
+
+// One cell of a set as it stands in the file.
+void append_cgats_cell(std::string& out, const std::string& cell);
+
+template <class Cells>
+void append_cgats_set(std::string& out, const Cells& cells) {
+  out += ' ';
+  bool first = true;
+  for (const std::string& cell : cells) {
+    if (!first) out += '\t';
+    first = false;
+    append_cgats_cell(out, cell);
+  }
+  out += '\n';
+}
 
 }  // namespace kvdata::cli

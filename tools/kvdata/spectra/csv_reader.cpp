@@ -4,7 +4,7 @@
 #include <cctype>
 #include <charconv>
 #include <cmath>
-#include <optional>
+#include <cstdint>
 
 #include "support/errors.hpp"
 #include "support/progress.hpp"
@@ -12,159 +12,137 @@
 namespace kvdata::cli {
 namespace {
 
-struct Line {
-  std::size_t number = 0;
-  std::vector<std::string> cells;
-};
+std::string_view trim(std::string_view s) {
+  const char* b = s.data();
+  const char* e = b + s.size();
+  while (b < e && (*b == ' ' || *b == '\t')) ++b;
+  while (e > b && (e[-1] == ' ' || e[-1] == '\t')) --e;
+  return std::string_view(b, static_cast<std::size_t>(e - b));
+}
 
-// Splits the text into records of cells. Quoted cells may hold separators,
-// doubled quotes and line breaks.
-std::vector<Line> split(const std::string& path, const std::string& text, char sep) {
-  std::vector<Line> lines;
-  Line current;
-  std::string cell;
-  std::size_t line_no = 1;
-  current.number = 1;
-  bool quoted = false;
-  bool any = false;
-  auto end_cell = [&] {
-    current.cells.push_back(cell);
-    cell.clear();
-  };
-  auto end_line = [&] {
-    end_cell();
-    const bool blank = current.cells.size() == 1 && current.cells[0].empty();
-    const bool comment =
-        !current.cells.empty() && !current.cells[0].empty() && current.cells[0][0] == '#';
-    if (!blank && !comment) lines.push_back(std::move(current));
-    current = Line{};
-    any = false;
-  };
-  for (std::size_t i = 0; i < text.size(); ++i) {
-    const char c = text[i];
-    if (!any) {
-      current.number = line_no;
-      any = true;
-    }
-    if (quoted) {
-      if (c == '"' && i + 1 < text.size() && text[i + 1] == '"') {
-        cell += '"';
-        ++i;
-      } else if (c == '"') {
-        quoted = false;
-      } else {
-        if (c == '\n') ++line_no;
-        cell += c;
-      }
-    } else if (c == '"' && cell.empty()) {
-      quoted = true;
-    } else if (c == sep) {
-      end_cell();
-    } else if (c == '\n' || c == '\r') {
-      if (c == '\r' && i + 1 < text.size() && text[i + 1] == '\n') ++i;
-      end_line();
-      ++line_no;
-    } else {
-      cell += c;
-    }
+// Powers of ten that a double holds exactly.
+constexpr double kExactPowers[] = {1e0,  1e1,  1e2,  1e3,  1e4,  1e5,  1e6,  1e7,
+                                   1e8,  1e9,  1e10, 1e11, 1e12, 1e13, 1e14, 1e15,
+                                   1e16, 1e17, 1e18, 1e19, 1e20, 1e21, 1e22};
+
+// The usual cell, a plain decimal such as "-12.345": its digits as an
+// integer divided by an exact power of ten, both exact doubles, so the one
+// rounded division gives the correctly rounded value, the same double that
+// std::from_chars gives. False for anything else (exponents, more digits
+// than a double holds exactly, stray characters), which from_chars decides.
+bool plain_decimal(const char* p, const char* last, double& v) {
+  const bool negative = p < last && *p == '-';
+  if (negative) ++p;
+  // Digits wrap past 19 of them; such a cell is left to from_chars.
+  std::uint64_t digits = 0;
+  const char* const whole = p;
+  while (p < last && static_cast<unsigned>(*p - '0') < 10) {
+    digits = 10 * digits + static_cast<unsigned>(*p - '0');
+    ++p;
   }
-  if (quoted)
-    bad_input(path + " line " + std::to_string(current.number) + ": a quoted cell is not closed");
-  if (any) end_line();
-  return lines;
+  const auto whole_count = p - whole;
+  std::ptrdiff_t decimals = 0;
+  if (p < last && *p == '.') {
+    const char* const fraction = ++p;
+    while (p < last && static_cast<unsigned>(*p - '0') < 10) {
+      digits = 10 * digits + static_cast<unsigned>(*p - '0');
+      ++p;
+    }
+    decimals = p - fraction;
+  }
+  const auto count = whole_count + decimals;
+  if (p != last || count == 0 || count > 19 || digits > (std::uint64_t{1} << 53) || decimals > 22) {
+    return false;
+  }
+  const double magnitude = static_cast<double>(digits) / kExactPowers[decimals];
+  v = negative ? -magnitude : magnitude;
+  return true;
 }
 
-std::string trim(const std::string& s) {
-  const auto b = s.find_first_not_of(" \t");
-  if (b == std::string::npos) return "";
-  const auto e = s.find_last_not_of(" \t");
-  return s.substr(b, e - b + 1);
-}
-
-std::string upper(std::string s) {
-  std::transform(s.begin(), s.end(), s.begin(),
+std::string upper(std::string_view s) {
+  std::string u(s);
+  std::transform(u.begin(), u.end(), u.begin(),
                  [](unsigned char c) { return static_cast<char>(std::toupper(c)); });
-  return s;
+  return u;
 }
 
-std::optional<double> number(const std::string& cell) {
-  const std::string t = trim(cell);
-  double v = 0;
+// A finite decimal number, blanks around it and a leading '+' allowed.
+bool number(std::string_view cell, double& v) {
+  const std::string_view t = trim(cell);
+  if (t.empty()) return false;
   const char* first = t.data();
-  if (!t.empty() && t[0] == '+') ++first;
-  const auto r = std::from_chars(first, t.data() + t.size(), v);
-  if (t.empty() || r.ec != std::errc{} || r.ptr != t.data() + t.size() || !std::isfinite(v)) {
-    return std::nullopt;
-  }
-  return v;
-}
-
-char separator(const std::string& text) {
-  const std::string first = text.substr(0, text.find('\n'));
-  if (first.find(',') != std::string::npos) return ',';
-  if (first.find(';') != std::string::npos) return ';';
-  if (first.find('\t') != std::string::npos) return '\t';
-  return ',';
+  const char* const last = t.data() + t.size();
+  if (*first == '+') ++first;
+  if (plain_decimal(first, last, v)) return true;
+  const auto r = std::from_chars(first, last, v);
+  return r.ec == std::errc{} && r.ptr == last && std::isfinite(v);
 }
 
 }  // namespace
 
-SpectraTable read_csv(const std::string& path, const std::string& text) {
-  SpectraTable table;
-  table.file = path;
-  table.format = "CSV";
-  const std::vector<Line> lines = split(path, text, separator(text));
-  if (lines.empty()) bad_input(path + ": is empty; expected a header row and one sample per row");
-
-  const Line& header = lines.front();
-  std::vector<std::size_t> spectral;
-  std::optional<std::size_t> name_column;
+CsvSpectraReader::CsvSpectraReader(std::string path, CsvRecords records)
+    : path_(std::move(path)), records_(std::move(records)) {
+  if (!records_.next()) {
+    bad_input(path_ + ": is empty; expected a header row and one sample per row");
+  }
   int name_rank = 99;
   constexpr const char* kNameColumns[] = {"SAMPLE_NAME", "SAMPLE_ID", "NAME",
                                           "SAMPLE",      "ID",        "LABEL"};
-  for (std::size_t c = 0; c < header.cells.size(); ++c) {
-    const std::string title = trim(header.cells[c]);
+  const auto header = records_.cells();
+  for (std::size_t c = 0; c < header.size(); ++c) {
+    titles_.emplace_back(trim(header[c]));
+    const std::string& title = titles_.back();
     const double nm = wavelength_of(title);
     if (nm > 0) {
-      spectral.push_back(c);
-      table.wavelengths.push_back(nm);
+      spectral_.push_back(c);
+      wavelengths_.push_back(nm);
       continue;
     }
     for (int rank = 0; rank < 6; ++rank) {
       if (upper(title) == kNameColumns[rank] && rank < name_rank) {
         name_rank = rank;
-        name_column = c;
+        name_column_ = c;
       }
     }
   }
-  if (spectral.empty()) {
-    bad_input(path + " line " + std::to_string(header.number) +
+  if (spectral_.empty()) {
+    bad_input(path_ + " line " + std::to_string(records_.line()) +
               ": no wavelength columns in the header (expected names such as 360, nm360 or "
               "SPECTRAL_NM360)");
   }
-  if (!name_column && spectral.front() != 0) name_column = 0;
+  if (!name_column_ && spectral_.front() != 0) name_column_ = 0;
+}
 
-  Progress progress("reading " + path, lines.size() - 1);
-  for (std::size_t i = 1; i < lines.size(); ++i) {
-    const Line& line = lines[i];
-    if (line.cells.size() != header.cells.size()) {
-      bad_input(path + " line " + std::to_string(line.number) + ": " +
-                std::to_string(line.cells.size()) + " cells, but the header has " +
-                std::to_string(header.cells.size()));
+bool CsvSpectraReader::next(std::span<double> values) {
+  if (!records_.next()) return false;
+  const auto cells = records_.cells();
+  if (cells.size() != titles_.size()) {
+    bad_input(path_ + " line " + std::to_string(records_.line()) + ": " +
+              std::to_string(cells.size()) + " cells, but the header has " +
+              std::to_string(titles_.size()));
+  }
+  name_ = name_column_ ? trim(cells[*name_column_]) : std::string_view{};
+  for (std::size_t i = 0; i < spectral_.size(); ++i) {
+    const std::string_view cell = cells[spectral_[i]];
+    if (!number(cell, values[i])) {
+      bad_input(path_ + " line " + std::to_string(records_.line()) + ", column " +
+                titles_[spectral_[i]] + ": not a number: \"" + std::string(trim(cell)) + "\"");
     }
-    SpectrumRow row;
-    row.place = line.number;
-    if (name_column) row.name = trim(line.cells[*name_column]);
-    for (std::size_t c : spectral) {
-      const auto v = number(line.cells[c]);
-      if (!v) {
-        bad_input(path + " line " + std::to_string(line.number) + ", column " +
-                  trim(header.cells[c]) + ": not a number: \"" + trim(line.cells[c]) + "\"");
-      }
-      row.values.push_back(*v);
-    }
-    table.rows.push_back(std::move(row));
-    progress.advance(i);
+  }
+  return true;
+}
+
+SpectraTable read_csv(const std::string& path, const std::string& text) {
+  SpectraTable table;
+  table.file = path;
+  table.format = "CSV";
+  CsvSpectraReader reader(path, CsvRecords(path, text));
+  table.wavelengths = reader.wavelengths();
+  std::vector<double> values(table.wavelengths.size());
+  Progress progress("reading " + path, text.size(), std::size_t{1} << 20, "bytes");
+  while (reader.next(values)) {
+    table.rows.push_back(SpectrumRow{std::string(reader.name()), reader.line(), values});
+    progress.advance(reader.bytes_read());
   }
   return table;
 }

@@ -8,14 +8,54 @@
 // double quotes. Empty lines and lines starting with # are skipped.
 //
 //   SpectraTable t = read_csv("white.csv", read_text("white.csv"));
+//   CsvSpectraReader r(std::move(records));  while (r.next(values)) ... r.name(), r.line()
 
+#include <optional>
+#include <span>
 #include <string>
+#include <string_view>
+#include <vector>
 
+#include "spectra/csv_records.hpp"
 #include "spectra/spectra_table.hpp"
 
 namespace kvdata::cli {
 
-// InputError names the file, the line and the column of the first bad cell.
+// The rows of a CSV spectra file one at a time.
+class CsvSpectraReader {
+ public:
+  // Reads the header row. InputError for an empty file or a header without
+  // wavelength columns.
+  CsvSpectraReader(std::string path, CsvRecords records);
+
+  const std::string& file() const { return path_; }
+  // Wavelengths of the spectral columns, in the file's column order.
+  const std::vector<double>& wavelengths() const { return wavelengths_; }
+
+  // Reads the next row's values (one per wavelength, in the order of
+  // wavelengths()) into `values`; false at the end. InputError names the
+  // line and column of a row that is wrong.
+  bool next(std::span<double> values);
+  // The current row's sample name, trimmed (empty when the file has none);
+  // valid until the next call to next().
+  std::string_view name() const { return name_; }
+  // The line of the current row.
+  std::size_t line() const { return records_.line(); }
+  // Bytes of the file read so far.
+  std::size_t bytes_read() const { return records_.bytes_read(); }
+
+ private:
+  std::string path_;
+  CsvRecords records_;
+  std::vector<std::string> titles_;  // trimmed header cells
+  std::vector<std::size_t> spectral_;
+  std::vector<double> wavelengths_;
+  std::optional<std::size_t> name_column_;
+  std::string_view name_;
+};
+
+// The whole file as a table. InputError names the file, the line and the
+// column of the first bad cell.
 SpectraTable read_csv(const std::string& path, const std::string& text);
 
 }  // namespace kvdata::cli

@@ -21,6 +21,25 @@ std::vector<Byte> read_bytes(const std::string& path);
 // The file's text, as bytes. Same failures as read_bytes.
 std::string read_text(const std::string& path);
 
+// A file opened for reading piece by piece, closed with the object. The
+// same failures as read_bytes, from the constructor and from read().
+class InputFile {
+ public:
+  explicit InputFile(const std::string& path);
+  ~InputFile();
+  InputFile(const InputFile&) = delete;
+  InputFile& operator=(const InputFile&) = delete;
+  // Up to `room` bytes into `to`; 0 at the end of the file.
+  std::size_t read(char* to, std::size_t room);
+  // The file's size when it is a regular file, otherwise 0.
+  std::size_t size() const { return size_; }
+
+ private:
+  std::string path_;
+  int fd_ = -1;
+  std::size_t size_ = 0;
+};
+
 // Replaces `path` with `content` atomically (temporary file, then rename).
 // On failure the temporary file is removed, `path` is untouched and
 // InputError names the file and the reason.

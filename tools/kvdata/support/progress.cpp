@@ -6,8 +6,9 @@
 
 namespace kvdata::cli {
 
-Progress::Progress(std::string label, std::size_t total, std::size_t threshold)
+Progress::Progress(std::string label, std::size_t total, std::size_t threshold, std::string unit)
     : label_(std::move(label)),
+      unit_(unit.empty() ? unit : " " + unit),
       total_(total),
       shown_(total >= threshold && ::isatty(STDERR_FILENO) == 1) {}
 
@@ -23,7 +24,8 @@ void Progress::advance(std::size_t done) {
   const int percent = static_cast<int>(done * 100 / total_);
   if (percent == percent_) return;
   percent_ = percent;
-  std::fprintf(stderr, "\r%s: %zu of %zu (%d%%)", label_.c_str(), done, total_, percent);
+  std::fprintf(stderr, "\r%s: %zu of %zu%s (%d%%)", label_.c_str(), done, total_, unit_.c_str(),
+               percent);
   std::fflush(stderr);
 }
 

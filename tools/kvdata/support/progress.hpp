@@ -15,7 +15,9 @@ namespace kvdata::cli {
 class Progress {
  public:
   // Work below `threshold` items is too short to be worth a progress line.
-  Progress(std::string label, std::size_t total, std::size_t threshold = 2000);
+  // `unit` follows the total ("bytes").
+  Progress(std::string label, std::size_t total, std::size_t threshold = 2000,
+           std::string unit = "");
   ~Progress();
   Progress(const Progress&) = delete;
   Progress& operator=(const Progress&) = delete;
@@ -25,6 +27,7 @@ class Progress {
 
  private:
   std::string label_;
+  std::string unit_;
   std::size_t total_;
   bool shown_;
   int percent_ = -1;

@@ -12,12 +12,16 @@ void TextTable::add_row(std::vector<std::string> cells) {
   rows_.push_back(std::move(cells));
 }
 
-namespace {
-
-// Display width: one per UTF-8 code point (continuation bytes do not count).
-std::size_t width(const std::string& s) {
+std::size_t display_width(const std::string& s) {
+  // Continuation bytes do not count.
   return static_cast<std::size_t>(
       std::count_if(s.begin(), s.end(), [](char c) { return (c & 0xC0) != 0x80; }));
+}
+
+namespace {
+
+std::size_t width(const std::string& s) {
+  return display_width(s);
 }
 
 }  // namespace

@@ -4,6 +4,7 @@
 //   TextTable t({{"sample", Align::Left}, {"L*", Align::Right}});
 //   t.add_row({"White 1", "95.120"});  std::cout << t.render();
 
+#include <cstddef>
 #include <string>
 #include <vector>
 
@@ -32,6 +33,9 @@ class TextTable {
   std::vector<Column> columns_;
   std::vector<std::vector<std::string>> rows_;
 };
+
+// Display width of a cell: one per UTF-8 code point.
+std::size_t display_width(const std::string& s);
 
 // Fixed-point text with `decimals` digits after the point ("-0.000" becomes "0.000").
 std::string fixed(double value, int decimals);

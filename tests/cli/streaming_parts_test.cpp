@@ -1,0 +1,200 @@
+// The parts the streaming commands are built from: CSV records read in
+// pieces, the number fast path, CGATS written in pieces, output files and
+// the spool.
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <charconv>
+#include <cstring>
+#include <filesystem>
+#include <fstream>
+
+#include "command_runner.hpp"
+#include "spectra/cgats_writer.hpp"
+#include "spectra/csv_reader.hpp"
+#include "spectra/csv_records.hpp"
+#include "support/errors.hpp"
+#include "support/output_file.hpp"
+#include "support/spool.hpp"
+
+namespace kvdata::cli {
+namespace {
+
+using test::Scratch;
+using test::slurp;
+using test::spill;
+
+struct Record {
+  std::size_t line;
+  std::vector<std::string> cells;
+  friend bool operator==(const Record&, const Record&) = default;
+};
+
+std::vector<Record> records_of(CsvRecords records) {
+  std::vector<Record> out;
+  while (records.next()) {
+    out.push_back({records.line(), {records.cells().begin(), records.cells().end()}});
+  }
+  return out;
+}
+
+// A source that hands out the text `step` bytes at a time.
+CsvRecords::Source trickle(const std::string& text, std::size_t step) {
+  return [&text, step, at = std::size_t{0}](char* to, std::size_t room) mutable {
+    const std::size_t n = std::min({step, room, text.size() - at});
+    std::memcpy(to, text.data() + at, n);
+    at += n;
+    return n;
+  };
+}
+
+TEST(StreamingParts, CsvRecordsInPiecesAsWhole) {
+  const std::string text =
+      "# head\r\nname;a;b\r\n\r\n\"x;y\";\"say \"\"hi\"\"\";3\rplain;\"two\nlines\";\r\n"
+      "\"\"\"q\";\"\"\"\";q\"x\n#skip;\"\n\";1\n;\n\"#quoted\";2;3\n\"\"\nlast;1;2";
+  const std::vector<Record> expected = {
+      {2, {"name", "a", "b"}},
+      {4, {"x;y", "say \"hi\"", "3"}},
+      {5, {"plain", "two\nlines", ""}},
+      {7, {"\"q", "\"", "q\"x"}},
+      {10, {"", ""}},
+      {13, {"last", "1", "2"}},
+  };
+  // The separator comes from the first line alone.
+  CsvRecords whole("t.csv", std::string_view(text));
+  EXPECT_EQ(whole.separator(), ',');
+  // With ';' on the first line:
+  const std::string semi = "name;a;b\n" + text.substr(text.find("\r\n\r\n") + 4);
+  EXPECT_EQ(CsvRecords("t.csv", std::string_view(semi)).separator(), ';');
+
+  const std::string body = "#;\n" + text.substr(text.find('\n') + 1);
+  const auto all = records_of(CsvRecords("t.csv", std::string_view(body)));
+  ASSERT_EQ(all, expected);
+  for (std::size_t step : {1, 2, 3, 7}) {
+    EXPECT_EQ(records_of(CsvRecords("t.csv", trickle(body, step))), expected) << step;
+  }
+
+  // A record longer than the reading buffer.
+  const std::string huge = "a,b\n\"" + std::string(3 << 20, 'z') + "\",1\nc,2\n";
+  const auto big = records_of(CsvRecords("t.csv", trickle(huge, 1 << 16)));
+  ASSERT_EQ(big.size(), 3u);
+  EXPECT_EQ(big[1].cells[0].size(), std::size_t{3} << 20);
+  EXPECT_EQ(big[2], (Record{3, {"c", "2"}}));
+
+  // An open quote names the line it starts on, however the text arrives.
+  const std::string open = "a,b\n1,2\n3,\"4\n5\n";
+  for (std::size_t step : {1, 100}) {
+    try {
+      records_of(CsvRecords("o.csv", trickle(open, step)));
+      ADD_FAILURE() << "no error";
+    } catch (const InputError& e) {
+      EXPECT_STREQ(e.what(), "o.csv line 3: a quoted cell is not closed");
+    }
+  }
+}
+
+TEST(StreamingParts, NumbersReadAsFromChars) {
+  const std::vector<std::string> cells = {"12.345",
+                                          "-0.5",
+                                          "+3",
+                                          " 7.25\t",
+                                          "5.",
+                                          ".5",
+                                          "-.5",
+                                          "1e2",
+                                          "0.30000000000000004",
+                                          "9007199254740992",
+                                          "9007199254740993",
+                                          "0.1234567890123456789",
+                                          "123456.7890123",
+                                          "-0.000",
+                                          "007.250",
+                                          "1234567890123456789",
+                                          "12345678901234567890",
+                                          "0.0000000000000000000001",
+                                          "0.00000000000000000000001",
+                                          "1.7976931348623157e308",
+                                          "4.9e-324"};
+  std::string text = "SAMPLE_NAME,360\n";
+  for (const std::string& c : cells) text += "s," + c + "\n";
+  const SpectraTable t = read_csv("n.csv", text);
+  ASSERT_EQ(t.rows.size(), cells.size());
+  for (std::size_t i = 0; i < cells.size(); ++i) {
+    std::string c = cells[i];
+    c.erase(0, c.find_first_not_of(" \t"));
+    c.erase(c.find_last_not_of(" \t") + 1);
+    if (c[0] == '+') c.erase(0, 1);
+    double expected = 0;
+    std::from_chars(c.data(), c.data() + c.size(), expected);
+    double got = t.rows[i].values[0];
+    EXPECT_EQ(std::memcmp(&got, &expected, sizeof got), 0) << cells[i] << ": " << got;
+  }
+  for (const std::string bad :
+       {"1.2.3", "-", ".", "1,5", "0x10", "inf", "nan", "1e999", "--1", "1 2"}) {
+    try {
+      read_csv("n.csv", "SAMPLE_NAME;360\ns;" + bad + "\n");
+      ADD_FAILURE() << bad;
+    } catch (const InputError& e) {
+      EXPECT_NE(std::string(e.what()).find("not a number"), std::string::npos) << bad;
+    }
+  }
+}
+
+TEST(StreamingParts, CgatsInPiecesAsWhole) {
+  const std::vector<std::string> fields = {"SAMPLE_ID", "SAMPLE_NAME", "XYZ_X", "LAB_L"};
+  const std::vector<std::string> names = {"Deep\xA0Grey", "a\tb",   "007",    "1e5", "+5",
+                                          "#3",           "it's",   "Tile A", "B",   "-",
+                                          "\xE9t\xE9",    "line 7", "1e-05"};
+  std::vector<std::vector<std::string>> rows;
+  for (std::size_t i = 0; i < 2000; ++i) {
+    rows.push_back({std::to_string(i + 1), names[i % names.size()], "0.30000000000000004",
+                    i % 2 ? "NaN" : "1e-05"});
+  }
+  std::string pieces = cgats_head("of \"x\"\nfile", fields, rows.size());
+  for (const auto& row : rows) append_cgats_set(pieces, row);
+  pieces += kCgatsTail;
+  EXPECT_EQ(pieces, write_cgats("of \"x\"\nfile", fields, rows));
+}
+
+TEST(StreamingParts, OutputFileAllOrNothing) {
+  Scratch s;
+  const std::string target = s.path("out.txt");
+  spill(target, "before");
+  {
+    OutputFile out(target);
+    out.write(std::string(3 << 20, 'a'));
+    out.write("tail");
+  }  // dropped: a failure part way
+  EXPECT_EQ(slurp(target), "before");
+  EXPECT_EQ(std::distance(std::filesystem::directory_iterator(s.dir()),
+                          std::filesystem::directory_iterator()),
+            1);
+  OutputFile out(target);
+  out.write(std::string(3 << 20, 'a'));
+  out.write("tail");
+  out.commit();
+  EXPECT_EQ(slurp(target), std::string(3 << 20, 'a') + "tail");
+  EXPECT_THROW({ OutputFile missing(s.path("absent/out.txt")); }, InputError);
+}
+
+TEST(StreamingParts, SpoolGivesBackWhatWasSetAside) {
+  for (std::size_t total : {std::size_t{10}, std::size_t{20} << 20}) {
+    Spool spool;
+    std::string expected;
+    for (std::size_t i = 0; expected.size() < total; ++i) {
+      const std::string piece = std::to_string(i) + ";";
+      spool.append(piece);
+      expected += piece;
+    }
+    spool.rewind();
+    std::string back(expected.size(), '\0');
+    ASSERT_TRUE(spool.read(back.data(), 3));
+    EXPECT_EQ(spool.read_some(back.data() + 3, back.size()), back.size() - 3);
+    EXPECT_EQ(back, expected) << total;
+    char more = 0;
+    EXPECT_FALSE(spool.read(&more, 1));
+  }
+}
+
+}  // namespace
+}  // namespace kvdata::cli

@@ -1,0 +1,71 @@
+#pragma once
+// The records of a CSV text, one at a time, read from a source in blocks so
+// that a file of any length needs only a block and the current record in
+// memory. Quoted cells may hold separators, doubled quotes and line breaks;
+// a quote opens a quoted cell only as the cell's first character. Lines end
+// in LF, CRLF or CR. Empty lines and lines whose first cell starts with #
+// are skipped. The separator is a comma, or a semicolon or tab when the
+// first line has no comma.
+//
+//   CsvRecords records(path, [&](char* to, std::size_t room) { return read(fd, to, room); });
+//   while (records.next()) for (std::string_view cell : records.cells()) ...
+
+#include <array>
+#include <cstddef>
+#include <functional>
+#include <span>
+#include <string>
+#include <string_view>
+#include <vector>
+
+namespace kvdata::cli {
+
+class CsvRecords {
+ public:
+  // Puts up to `room` bytes at `to`; returns how many, 0 at the end.
+  using Source = std::function<std::size_t(char* to, std::size_t room)>;
+
+  // `path` names the file in messages. Reads the first line to choose the
+  // separator.
+  CsvRecords(std::string path, Source source);
+  // Over a text held whole.
+  CsvRecords(std::string path, std::string_view text);
+
+  char separator() const { return separator_; }
+
+  // Moves to the next record that is neither empty nor a comment; false at
+  // the end. InputError names the line of a quoted cell that is not closed.
+  bool next();
+  // The current record's cells, valid until the next call to next().
+  std::span<const std::string_view> cells() const { return cells_; }
+  // The line on which the current record starts (1-based).
+  std::size_t line() const { return record_line_; }
+  // Bytes taken from the source so far.
+  std::size_t bytes_read() const { return bytes_read_; }
+  // The bytes read but not yet parsed, at most `n` of them, for a look at
+  // what a file holds.
+  std::string_view peek(std::size_t n) const;
+
+ private:
+  enum class Step { Record, NeedMore, End };
+  Step parse_plain();
+  Step parse_quoted();
+  bool more();
+  void finish(std::size_t next_begin, std::size_t next_line);
+
+  std::string path_;
+  Source source_;
+  std::vector<char> buffer_;
+  std::size_t begin_ = 0;  // start of the unparsed bytes
+  std::size_t end_ = 0;    // end of the bytes read
+  bool at_end_ = false;    // the source has nothing more
+  std::size_t bytes_read_ = 0;
+  std::size_t line_ = 1;  // line at begin_
+  std::size_t record_line_ = 0;
+  char separator_ = ',';
+  std::array<bool, 256> ends_cell_{};  // the separator, CR and LF
+  std::vector<std::string_view> cells_;
+  std::vector<std::string> owned_;  // cells of a record with quoted cells
+};
+
+}  // namespace kvdata::cli
