@@ -72,6 +72,8 @@ TEST(StreamingParts, CsvRecordsInPiecesAsWhole) {
   ASSERT_EQ(all, expected);
   for (std::size_t step : {1, 2, 3, 7}) {
     EXPECT_EQ(records_of(CsvRecords("t.csv", trickle(body, step))), expected) << step;
+    // Blocks smaller than a record: the buffer grows and keeps its place.
+    EXPECT_EQ(records_of(CsvRecords("t.csv", trickle(body, step), 4)), expected) << step;
   }
 
   // A record longer than the reading buffer.

@@ -7,14 +7,10 @@
 #include "support/errors.hpp"
 
 namespace kvdata::cli {
-namespace {
-
-constexpr std::size_t kBlockBytes = std::size_t{1} << 20;
-
-}  // namespace
-
-CsvRecords::CsvRecords(std::string path, Source source)
-    : path_(std::move(path)), source_(std::move(source)), buffer_(kBlockBytes) {
+CsvRecords::CsvRecords(std::string path, Source source, std::size_t block_bytes)
+    : path_(std::move(path)),
+      source_(std::move(source)),
+      buffer_(std::max<std::size_t>(block_bytes, 1)) {
   // The separator comes from the first line, up to its LF (or the whole text).
   const char* newline = nullptr;
   while (newline == nullptr) {
@@ -35,12 +31,15 @@ CsvRecords::CsvRecords(std::string path, Source source)
 }
 
 CsvRecords::CsvRecords(std::string path, std::string_view text)
-    : CsvRecords(std::move(path), [text, at = std::size_t{0}](char* to, std::size_t room) mutable {
-        const std::size_t n = std::min(room, text.size() - at);
-        std::memcpy(to, text.data() + at, n);
-        at += n;
-        return n;
-      }) {}
+    : CsvRecords(
+          std::move(path),
+          [text, at = std::size_t{0}](char* to, std::size_t room) mutable {
+            const std::size_t n = std::min(room, text.size() - at);
+            std::memcpy(to, text.data() + at, n);
+            at += n;
+            return n;
+          },
+          text.size() + 1) {}
 
 std::string_view CsvRecords::peek(std::size_t n) const {
   return std::string_view(buffer_.data() + begin_, std::min(n, end_ - begin_));

@@ -26,9 +26,10 @@ class CsvRecords {
   using Source = std::function<std::size_t(char* to, std::size_t room)>;
 
   // `path` names the file in messages. Reads the first line to choose the
-  // separator.
-  CsvRecords(std::string path, Source source);
-  // Over a text held whole.
+  // separator. The source is read in blocks of `block_bytes` (a record
+  // longer than that grows the buffer).
+  CsvRecords(std::string path, Source source, std::size_t block_bytes = std::size_t{1} << 20);
+  // Over a text held whole: one block the size of the text.
   CsvRecords(std::string path, std::string_view text);
 
   char separator() const { return separator_; }
