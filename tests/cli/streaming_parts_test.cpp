@@ -10,6 +10,7 @@
 #include <fstream>
 
 #include "command_runner.hpp"
+#include "spectra/cgats_reader.hpp"
 #include "spectra/cgats_writer.hpp"
 #include "spectra/csv_reader.hpp"
 #include "spectra/csv_records.hpp"
@@ -142,20 +143,34 @@ TEST(StreamingParts, NumbersReadAsFromChars) {
   }
 }
 
-TEST(StreamingParts, CgatsInPiecesAsWhole) {
-  const std::vector<std::string> fields = {"SAMPLE_ID", "SAMPLE_NAME", "XYZ_X", "LAB_L"};
-  const std::vector<std::string> names = {"Deep\xA0Grey", "a\tb",   "007",    "1e5", "+5",
-                                          "#3",           "it's",   "Tile A", "B",   "-",
-                                          "\xE9t\xE9",    "line 7", "1e-05"};
-  std::vector<std::vector<std::string>> rows;
-  for (std::size_t i = 0; i < 2000; ++i) {
-    rows.push_back({std::to_string(i + 1), names[i % names.size()], "0.30000000000000004",
-                    i % 2 ? "NaN" : "1e-05"});
-  }
-  std::string pieces = cgats_head("of \"x\"\nfile", fields, rows.size());
-  for (const auto& row : rows) append_cgats_set(pieces, row);
-  pieces += kCgatsTail;
-  EXPECT_EQ(pieces, write_cgats("of \"x\"\nfile", fields, rows));
+TEST(StreamingParts, CgatsWholeFileBytes) {
+  const std::vector<std::string> fields = {"SAMPLE_NAME", "SPECTRAL_NM360"};
+  EXPECT_EQ(write_cgats("of \"x\"\nfile", fields, {{"Tile A", "1e-05"}, {"it's", "2.5"}}),
+            "CGATS.17\n"
+            "ORIGINATOR\t\"kvdata\"\n"
+            "DESCRIPTOR\t\"of 'x' file\"\n"
+            "NUMBER_OF_FIELDS\t2\n"
+            "NUMBER_OF_SETS\t2\n"
+            "BEGIN_DATA_FORMAT\n"
+            " SAMPLE_NAME\tSPECTRAL_NM360\n"
+            "END_DATA_FORMAT\n"
+            "BEGIN_DATA\n"
+            " \"Tile A\"\t1.0e-05\n"
+            " \"it's\"\t2.5\n"
+            "END_DATA\n");
+  // No sets: no data section (Little CMS refuses an empty one), and the file
+  // reads back as a table without sets.
+  const std::string none = write_cgats("none", fields, {});
+  const std::string end =
+      "NUMBER_OF_SETS\t0\nBEGIN_DATA_FORMAT\n SAMPLE_NAME\tSPECTRAL_NM360\nEND_DATA_FORMAT\n";
+  ASSERT_GE(none.size(), end.size());
+  EXPECT_EQ(none.substr(none.size() - end.size()), end);
+  Scratch s;
+  const std::string empty = s.path("empty.cgats");
+  spill(empty, none);
+  EXPECT_TRUE(read_cgats(empty).rows.empty());
+  // A set with another number of cells than there are fields is refused.
+  EXPECT_THROW(write_cgats("d", fields, {{"only a name"}}), InputError);
 }
 
 TEST(StreamingParts, OutputFileAllOrNothing) {

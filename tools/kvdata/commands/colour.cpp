@@ -272,7 +272,7 @@ class CgatsWriter : public ResultWriter {
     while (const std::size_t n = spool_.read_some(block.data(), block.size())) {
       out_.write(std::string_view(block.data(), n));
     }
-    out_.write(kCgatsTail);
+    out_.write(cgats_tail(total));
   }
 
  private:

@@ -15,19 +15,24 @@ namespace kvdata::cli {
 // would not (empty ones, ones with tabs, '#', quotes or bytes beyond ASCII,
 // or numbers the reader would print otherwise) are quoted. A cell holding a
 // double quote or a line break cannot be written: InputError. Quotes and
-// line breaks in the descriptor become single quotes and blanks.
+// line breaks in the descriptor become single quotes and blanks. A set with
+// another number of cells than `fields` is refused. The file is built from
+// the pieces below, so a file written whole and one written in pieces agree.
 std::string write_cgats(const std::string& descriptor, const std::vector<std::string>& fields,
                         const std::vector<std::vector<std::string>>& rows);
 
 // The same file written in pieces, for more sets than are worth holding at
 // once: cgats_head() (the properties, NUMBER_OF_SETS `sets`, the data format
-// and BEGIN_DATA), then append_cgats_set() for each set, then kCgatsTail.
-// Together they are the bytes write_cgats gives for the same sets.
+// and BEGIN_DATA), then append_cgats_set() for each set, then cgats_tail().
+// A file without sets has no data section at all: Little CMS refuses an
+// empty one.
 std::string cgats_head(const std::string& descriptor, const std::vector<std::string>& fields,
                        std::size_t sets);
 template <class Cells>
 void append_cgats_set(std::string& out, const Cells& cells);
-inline constexpr const char* kCgatsTail = "END_DATA\n";
+inline const char* cgats_tail(std::size_t sets) {
+  return sets > 0 ? "END_DATA\n" : "";
+}
 
 // One cell of a set as it stands in the file.
 void append_cgats_cell(std::string& out, const std::string& cell);
