@@ -59,6 +59,7 @@ TEST(StreamingParts, CsvRecordsInPiecesAsWhole) {
       {5, {"plain", "two\nlines", ""}},
       {7, {"\"q", "\"", "q\"x"}},
       {10, {"", ""}},
+      {11, {"#quoted", "2", "3"}},
       {13, {"last", "1", "2"}},
   };
   // The separator comes from the first line alone.

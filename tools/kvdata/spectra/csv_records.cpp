@@ -155,6 +155,9 @@ CsvRecords::Step CsvRecords::parse_quoted() {
 
 bool CsvRecords::next() {
   for (;;) {
+    // Where the record starts: parsing leaves the bytes in place, so its
+    // first byte is still there once it has been read.
+    const std::size_t start = begin_;
     const Step step = parse_plain();
     if (step == Step::End) return false;
     if (step == Step::NeedMore) {
@@ -162,7 +165,9 @@ bool CsvRecords::next() {
       continue;
     }
     const bool blank = cells_.size() == 1 && cells_[0].empty();
-    const bool comment = !cells_[0].empty() && cells_[0][0] == '#';
+    // Only a # as the line's first byte makes a comment: a quoted first cell
+    // that starts with # is data (the way to write a sample named "#3").
+    const bool comment = buffer_[start] == '#';
     if (!blank && !comment) return true;
   }
 }

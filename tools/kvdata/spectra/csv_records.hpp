@@ -3,9 +3,9 @@
 // that a file of any length needs only a block and the current record in
 // memory. Quoted cells may hold separators, doubled quotes and line breaks;
 // a quote opens a quoted cell only as the cell's first character. Lines end
-// in LF, CRLF or CR. Empty lines and lines whose first cell starts with #
-// are skipped. The separator is a comma, or a semicolon or tab when the
-// first line has no comma.
+// in LF, CRLF or CR. Empty lines and lines that start with # are skipped
+// (a quoted first cell that starts with # is data). The separator is a comma, or a semicolon or tab
+// when the first line has no comma.
 //
 //   CsvRecords records(path, [&](char* to, std::size_t room) { return read(fd, to, room); });
 //   while (records.next()) for (std::string_view cell : records.cells()) ...
