@@ -4,8 +4,8 @@
 // memory. Quoted cells may hold separators, doubled quotes and line breaks;
 // a quote opens a quoted cell only as the cell's first character. Lines end
 // in LF, CRLF or CR. Empty lines and lines that start with # are skipped
-// (a quoted first cell that starts with # is data). The separator is a comma, or a semicolon or tab
-// when the first line has no comma.
+// (a quoted first cell that starts with # is data). The separator is a
+// comma, or a semicolon or tab when the first line has no comma.
 //
 //   CsvRecords records(path, [&](char* to, std::size_t room) { return read(fd, to, room); });
 //   while (records.next()) for (std::string_view cell : records.cells()) ...
