@@ -19,6 +19,7 @@
 #include "kvdata/foundation/ikv_tolerance.hpp"
 #include "kvdata/foundation/organizations.hpp"
 #include "kvdata/foundation/profiles.hpp"
+#include "kvdata/foundation/record_fields.hpp"
 #include "kvdata/foundation/records.hpp"
 #include "kvdata/foundation/server_db.hpp"
 #include "kvdata/foundation/stations.hpp"

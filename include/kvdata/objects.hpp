@@ -14,3 +14,4 @@
 #include "kvdata/objects/kv_tol_set.hpp"
 #include "kvdata/objects/kv_tolerance.hpp"
 #include "kvdata/objects/kv_user.hpp"
+#include "kvdata/objects/object_fields.hpp"

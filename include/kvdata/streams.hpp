@@ -3,4 +3,5 @@
 // stream files.
 
 #include "kvdata/streams/field_codec.hpp"
+#include "kvdata/streams/stream_observer.hpp"
 #include "kvdata/streams/streams.hpp"

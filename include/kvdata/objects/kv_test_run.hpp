@@ -52,8 +52,15 @@ class KVTestRun : public IKVObj, public IKVStream, public InertDBObject, public 
   tTestRun1 v1TestRun() const { return record_; }
   // Replaces the record with a deep copy of `value`.
   void v1TestRun(const tTestRun1& value) { record_ = value; }
-  // Stores the text unchanged; it can only be set, and travels after the record.
+  // Stores the text unchanged; it travels after the record.
   void LightLevelData(const String& value) { light_level_data_ = value; }
+  // The text as set or last read (not part of the automation interface,
+  // which can only set it).
+  const String& LightLevelData() const { return light_level_data_; }
+  // The stream version StreamOut writes: 1.4 when new, otherwise the version
+  // last read or set.
+  Single StreamVersion() const { return version_; }
+  void StreamVersion(Single value) { version_ = value; }
 
  protected:
   String IKVObj_ObjType() const override;
