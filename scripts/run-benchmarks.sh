@@ -161,6 +161,24 @@ if [ -x "$kvdata_bin" ] && "$kvdata_bin" colour --help >/dev/null 2>&1; then
 else
   e2e_note="The \`kvdata colour\` command was not built in this tree, so the end-to-end figures are missing."
 fi
+
+# --- decode and explain of a large test run: peak memory --------------------------
+# Two series of 32 767 tiles, about 42 MB; each command writes to standard
+# output (here /dev/null), and its peak memory is held to three times the
+# input's size plus 32 MB.
+stream_rows=""
+make_test_run=build/release/bench/make_test_run
+if [ -x "$kvdata_bin" ] && [ -x "$make_test_run" ] && declare -f timed >/dev/null; then
+  echo "== kvdata decode and explain of a large test run" >&2
+  "$make_test_run" "$work/testrun.kvs"
+  stream_bytes=$(stat -c %s "$work/testrun.kvs")
+  stream_bound_kb=$(((3 * stream_bytes + 32 * 1024 * 1024) / 1024))
+  for args in "decode testrun" "explain testrun" "explain --json testrun"; do
+    # shellcheck disable=SC2086 # the words of $args are the command's arguments
+    IFS=$'\t' read -r wall cpu rss <<<"$(timed stream "$kvdata_bin" $args "$work/testrun.kvs")"
+    stream_rows+="| \`kvdata $args\` | $wall s | $cpu s | $((rss / 1024)) MB | $(verdict "$rss" "$stream_bound_kb") |"$'\n'
+  done
+fi
 load_after="$(cut -d' ' -f1-3 /proc/loadavg)"
 
 # --- RESULTS.md -------------------------------------------------------------------
@@ -305,6 +323,18 @@ host_wall_ratio="$(jq -r 'map(.real_time / .cpu_time) | add / length' "$work/med
       echo "- The colour work (the batch rate above applied to $spectra spectra) is $colour_share % of"
       echo "  the command's CPU time; the rest is reading, parsing and writing."
     fi
+  fi
+  if [ -n "$stream_rows" ]; then
+    echo
+    echo "## \`kvdata decode\` and \`explain\` of a large test run"
+    echo
+    echo "A test-run stream of two series of 32 767 tiles ($((stream_bytes / 1000000)) MB, made by"
+    echo "\`make_test_run\`), written to standard output; one process each, measured by GNU time."
+    echo "Target: peak memory at most three times the input plus 32 MB ($((stream_bound_kb / 1024)) MB)."
+    echo
+    echo "| command | wall | CPU (user + sys) | peak memory | within the bound |"
+    echo "|---|---|---|---|---|"
+    printf '%s' "$stream_rows"
   fi
   if [ -f bench/NOTES.md ]; then
     echo
