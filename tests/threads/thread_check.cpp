@@ -196,7 +196,7 @@ void swap_sinks() {
 }  // namespace
 
 int main(int argc, char** argv) {
-  const int rounds = argc > 1 ? std::atoi(argv[1]) : 400;
+  const int rounds = argc > 1 ? std::atoi(argv[1]) : 1000;
   const std::filesystem::path folder = std::filesystem::temp_directory_path() /
                                        ("kvdata_thread_check_" + std::to_string(::getpid()));
   std::filesystem::create_directories(folder);
