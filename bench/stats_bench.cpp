@@ -101,14 +101,14 @@ void BM_PlainLoop(benchmark::State& state) {
       high.fill(-9999.0f);
       for (std::size_t k = 0; k < kSamples; ++k) {
         const Single* s = samples + k * kPoints;
-        for (int i = 0; i < kPoints; ++i) {
+        for (std::size_t i = 0; i < kPoints; ++i) {
           sum[i] = static_cast<Single>(static_cast<Double>(sum[i]) + static_cast<Double>(s[i]));
           low[i] = low[i] > s[i] ? s[i] : low[i];
           high[i] = high[i] < s[i] ? s[i] : high[i];
         }
       }
       std::array<Single, kPoints> spread;
-      for (int i = 0; i < kPoints; ++i) {
+      for (std::size_t i = 0; i < kPoints; ++i) {
         sum[i] = static_cast<Single>(static_cast<Double>(sum[i]) / static_cast<Double>(kSamples));
         spread[i] = high[i] - low[i];
       }

@@ -117,5 +117,21 @@ int main(int argc, char** argv) {
               back.IIA.Has2Measurement ? "two" : "one", second.Tiles.size(),
               static_cast<double>(second.Tiles(13).Trial.Spectrum(eSC::SCI).Data(40)));
   std::puts("testrun_client: the test run came back unchanged");
+
+  // A tolerance set: on the set, ID and Description are the set's own; its
+  // identity as a domain object is reached through IKVObj.
+  auto tolerance = KVTolerance::create();
+  tolerance->ID(12);
+  tolerance->TolName(u"dE*ab white");
+  tolerance->MaxFail(0.5);
+  auto tol_set = KVTolSet::create();
+  tol_set->ID(7);
+  tol_set->Description(u"Bench spectrophotometers");
+  tol_set->Add(tolerance, u"12");
+  std::printf("tolerance set %d (%s, %s): %s fails above %.2f\n", tol_set->ID(),
+              to_utf8(tol_set->Description().to_string()).c_str(),
+              to_utf8(query<IKVObj>(tol_set)->Description()).c_str(),
+              to_utf8(tol_set->Item(Long{12})->TolName()).c_str(),
+              tol_set->Item(Long{12})->MaxFail());
   return 0;
 }

@@ -22,13 +22,13 @@ namespace d65 = detail::d65_10;
 using d65::FlagLanes;
 using d65::kLanes;
 using d65::SingleLanes;
-constexpr int kBands = d65::kBands;
+constexpr std::size_t kBands = d65::kBands;
 
 // Stored weights widened to double, [component][band - 1].
 constexpr auto kWeights = [] {
   std::array<std::array<Double, kBands>, d65::kComponents> w{};
-  for (int c = 0; c < d65::kComponents; ++c) {
-    for (int b = 1; b <= kBands; ++b) w[c][b - 1] = static_cast<Double>(d65::weight(c, b));
+  for (std::size_t c = 0; c < d65::kComponents; ++c) {
+    for (std::size_t b = 1; b <= kBands; ++b) w[c][b - 1] = static_cast<Double>(d65::weight(c, b));
   }
   return w;
 }();
@@ -41,16 +41,16 @@ constexpr auto kWeights = [] {
 // zero weight times an infinity is NaN, and nothing turns NaN or an
 // infinity back into a finite sum), so checking the three sums before the
 // clamp catches it along with overflow. Bands 1 and 2 are checked on their own.
-constexpr int kFirstBand = 3;
-constexpr int kLastZBand = 21;
-constexpr int kSummedBands = kBands - kFirstBand + 1;
+constexpr std::size_t kFirstBand = 3;
+constexpr std::size_t kLastZBand = 21;
+constexpr std::size_t kSummedBands = kBands - kFirstBand + 1;
 constexpr bool weights_vanish_outside_summed_bands() {
-  for (int c = 0; c < d65::kComponents; ++c) {
-    for (int b = 1; b < kFirstBand; ++b) {
+  for (std::size_t c = 0; c < d65::kComponents; ++c) {
+    for (std::size_t b = 1; b < kFirstBand; ++b) {
       if (kWeights[c][b - 1] != 0.0) return false;
     }
   }
-  for (int b = kLastZBand + 1; b <= kBands; ++b) {
+  for (std::size_t b = kLastZBand + 1; b <= kBands; ++b) {
     if (kWeights[2][b - 1] != 0.0) return false;
   }
   return true;
@@ -82,10 +82,10 @@ void load(Block& blk, const SpectrumReader& spectrum, std::size_t first, std::si
     if (l < n) {
       const Single* src = spectrum(first + l);
       blk.fault[l] = non_finite(src[0]) | non_finite(src[1]);
-      for (int b = kFirstBand; b <= kBands; ++b) blk.refl[b - kFirstBand][l] = src[b - 1];
+      for (std::size_t b = kFirstBand; b <= kBands; ++b) blk.refl[b - kFirstBand][l] = src[b - 1];
     } else {
       blk.fault[l] = 0;
-      for (int b = kFirstBand; b <= kBands; ++b) blk.refl[b - kFirstBand][l] = 0.0f;
+      for (std::size_t b = kFirstBand; b <= kBands; ++b) blk.refl[b - kFirstBand][l] = 0.0f;
     }
   }
 }
@@ -94,29 +94,29 @@ void sum_xyz(Block& blk) {
   alignas(64) SingleLanes x{};
   alignas(64) SingleLanes y{};
   alignas(64) SingleLanes z{};
-  for (int b = kFirstBand; b <= kLastZBand; ++b) {
+  for (std::size_t b = kFirstBand; b <= kLastZBand; ++b) {
     const Double wx = kWeights[0][b - 1];
     const Double wy = kWeights[1][b - 1];
     const Double wz = kWeights[2][b - 1];
     const auto& r = blk.refl[b - kFirstBand];
-    for (int l = 0; l < kLanes; ++l) {
+    for (std::size_t l = 0; l < kLanes; ++l) {
       const auto rl = static_cast<Double>(r[l]);
       x[l] = static_cast<Single>(static_cast<Double>(x[l]) + wx * rl);
       y[l] = static_cast<Single>(static_cast<Double>(y[l]) + wy * rl);
       z[l] = static_cast<Single>(static_cast<Double>(z[l]) + wz * rl);
     }
   }
-  for (int b = kLastZBand + 1; b <= kBands; ++b) {
+  for (std::size_t b = kLastZBand + 1; b <= kBands; ++b) {
     const Double wx = kWeights[0][b - 1];
     const Double wy = kWeights[1][b - 1];
     const auto& r = blk.refl[b - kFirstBand];
-    for (int l = 0; l < kLanes; ++l) {
+    for (std::size_t l = 0; l < kLanes; ++l) {
       const auto rl = static_cast<Double>(r[l]);
       x[l] = static_cast<Single>(static_cast<Double>(x[l]) + wx * rl);
       y[l] = static_cast<Single>(static_cast<Double>(y[l]) + wy * rl);
     }
   }
-  for (int l = 0; l < kLanes; ++l) {
+  for (std::size_t l = 0; l < kLanes; ++l) {
     blk.fault[l] |= non_finite(x[l]) | non_finite(y[l]) | non_finite(z[l]);
     blk.xyz[0][l] = x[l] < 0.0f ? 0.0f : x[l];
     blk.xyz[1][l] = y[l] < 0.0f ? 0.0f : y[l];
@@ -126,8 +126,8 @@ void sum_xyz(Block& blk) {
 
 void xyz_to_lab(Block& blk) {
   alignas(64) std::array<SingleLanes, 3> ratio;
-  for (int c = 0; c < 3; ++c) {
-    for (int l = 0; l < kLanes; ++l) ratio[c][l] = d65::ratio(blk.xyz[c][l], c);
+  for (std::size_t c = 0; c < 3; ++c) {
+    for (std::size_t l = 0; l < kLanes; ++l) ratio[c][l] = d65::ratio(blk.xyz[c][l], c);
   }
   // Powers of the lanes above the threshold.
   alignas(64) std::array<SingleLanes, 3> f;
@@ -137,13 +137,13 @@ void xyz_to_lab(Block& blk) {
   (void)d65::exact_power_lanes(ratio[1], f[1], l_star);
   (void)d65::exact_power_lanes(ratio[2], f[2], unused);
   // The linear branch, and the differences.
-  for (int c = 0; c < 3; ++c) {
-    for (int l = 0; l < kLanes; ++l) {
+  for (std::size_t c = 0; c < 3; ++c) {
+    for (std::size_t l = 0; l < kLanes; ++l) {
       const Single linear = d65::linear_f(ratio[c][l]);
       f[c][l] = d65::above_threshold(ratio[c][l]) ? f[c][l] : linear;
     }
   }
-  for (int l = 0; l < kLanes; ++l) {
+  for (std::size_t l = 0; l < kLanes; ++l) {
     const Single linear = d65::linear_l(ratio[1][l]);
     blk.lab[0][l] = d65::above_threshold(ratio[1][l]) ? l_star[l] : linear;
     blk.lab[1][l] = d65::lab_a(f[0][l], f[1][l]);
@@ -172,7 +172,7 @@ std::size_t convert_block(const SpectrumReader& spectrum, std::size_t first, std
       std::fill_n(c, 3, kNaN);
       continue;
     }
-    for (int i = 0; i < 3; ++i) {
+    for (std::size_t i = 0; i < 3; ++i) {
       x[i] = blk.xyz[i][l];
       c[i] = blk.lab[i][l];
     }

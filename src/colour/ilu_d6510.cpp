@@ -1,6 +1,7 @@
 #include "kvdata/colour/ilu_d6510.hpp"
 
 #include <cmath>
+#include <cstddef>
 
 #include "colour/detail/d65_10.hpp"
 
@@ -12,10 +13,10 @@ namespace d65 = detail::d65_10;
 inline constexpr char16_t kIlluminantName[] = u"ILLUMINANT D65, 1964 OBSERVER, 10nm INTERVAL";
 
 // The component as an index 0..2; anything else raises error 9.
-int component_index(eXYZ component) {
+std::size_t component_index(eXYZ component) {
   const auto c = static_cast<Long>(component);
-  if (c < 0 || c >= d65::kComponents) raise(kSubscriptOutOfRange);
-  return static_cast<int>(c);
+  if (c < 0 || c >= static_cast<Long>(d65::kComponents)) raise(kSubscriptOutOfRange);
+  return static_cast<std::size_t>(c);
 }
 
 }  // namespace
@@ -25,7 +26,7 @@ std::shared_ptr<ILU_D6510> ILU_D6510::create() {
 }
 
 ILU_D6510::ILU_D6510() {
-  for (int c = 0; c < d65::kComponents; ++c) {
+  for (std::size_t c = 0; c < d65::kComponents; ++c) {
     weights_[c] = d65::kTable[c];
     white_point_[c] = d65::kWhitePoint[c];
   }
@@ -57,9 +58,9 @@ String ILU_D6510::IIlluminant_Illuminant() const {
 }
 
 Array<Single> ILU_D6510::IIlluminant_Weights(const eXYZ& XYZ) const {
-  const int c = component_index(XYZ);
-  Array<Single> out(1, d65::kBands);
-  for (int b = 1; b <= d65::kBands; ++b) out(b) = weights_[c][b - 1];
+  const std::size_t c = component_index(XYZ);
+  Array<Single> out(1, static_cast<Long>(d65::kBands));
+  for (std::size_t b = 1; b <= d65::kBands; ++b) out(static_cast<Long>(b)) = weights_[c][b - 1];
   return out;
 }
 
@@ -81,22 +82,22 @@ Array<Single> ILU_D6510::IIlluminant_LAB() const {
 }
 
 void ILU_D6510::IIlluminant_calcXYZ(const tSpectrum& RefIn, Array<Single>& XYZOut) const {
-  for (int c = 0; c < d65::kComponents; ++c) {
+  for (std::size_t c = 0; c < d65::kComponents; ++c) {
     Single sum = 0.0f;
-    for (int b = 1; b <= d65::kBands; ++b) {
-      sum = d65::accumulate(sum, weights_[c][b - 1], RefIn.Data(b));
+    for (std::size_t b = 1; b <= d65::kBands; ++b) {
+      sum = d65::accumulate(sum, weights_[c][b - 1], RefIn.Data(static_cast<Long>(b)));
     }
     // An overflowed or NaN sum is a fault before the clamp could hide it.
-    XYZOut(c) = d65::clamp_sum(d65::checked(sum));
+    XYZOut(static_cast<Long>(c)) = d65::clamp_sum(d65::checked(sum));
   }
 }
 
 void ILU_D6510::IIlluminant_calcLAB(const Array<Single>& XYZIn, Array<Single>& LABOut) const {
   std::array<Single, 3> ratio{};
   std::array<Double, 3> power{};
-  for (int i = 0; i < 3; ++i) {
-    ratio[i] = d65::checked(
-        static_cast<Single>(static_cast<Double>(XYZIn(i)) / static_cast<Double>(white_point_[i])));
+  for (std::size_t i = 0; i < 3; ++i) {
+    ratio[i] = d65::checked(static_cast<Single>(static_cast<Double>(XYZIn(static_cast<Long>(i))) /
+                                                static_cast<Double>(white_point_[i])));
     // No power of a ratio at or below the threshold is taken (nor of a negative one).
     if (d65::above_threshold(ratio[i])) power[i] = d65::power(ratio[i]);
   }

@@ -1,8 +1,8 @@
 #include "kvdata/objects/kv_calibration.hpp"
 
 #include <cstddef>
-#include <new>
 
+#include "automation/detail/failure.hpp"
 #include "kvdata/automation/error.hpp"
 #include "kvdata/automation/text.hpp"
 #include "kvdata/objects/kv_cal_tile.hpp"
@@ -154,15 +154,11 @@ bool KVCalibration::IKVStream_StreamIn(const ByteArray& bytStream, Long& Positio
 }
 
 bool KVCalibration::IKVStream_StreamOut(ByteArray& bytStream, Long& Position) {
-  try {
+  return detail::false_on_failure([&] {
     if (Position < 0) return false;  // before any array a writer makes
     detail::resize_stream(bytStream, detail::index_after(Position, kBlockBytes));
     return detail::put_block(bytStream, Position, block_);
-  } catch (const Error&) {
-    return false;
-  } catch (const std::bad_alloc&) {
-    return false;
-  }
+  });
 }
 
 Long KVCalibration::IKVStream_StreamLen() const {

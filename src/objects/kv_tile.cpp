@@ -1,7 +1,6 @@
 #include "kvdata/objects/kv_tile.hpp"
 
-#include <new>
-
+#include "automation/detail/failure.hpp"
 #include "kvdata/automation/error.hpp"
 #include "objects/detail/narrow_single.hpp"
 #include "objects/detail/object_stream.hpp"
@@ -79,15 +78,11 @@ bool KVTile::IKVStream_StreamIn(const ByteArray& bytStream, Long& Position) {
 }
 
 bool KVTile::IKVStream_StreamOut(ByteArray& bytStream, Long& Position) {
-  try {
+  return detail::false_on_failure([&] {
     if (Position < 0) return false;  // before any array a writer makes
     detail::resize_stream(bytStream, detail::index_after(Position, kTileBlockBytes));
     return detail::put_block(bytStream, Position, block_);
-  } catch (const Error&) {
-    return false;
-  } catch (const std::bad_alloc&) {
-    return false;
-  }
+  });
 }
 
 Long KVTile::IKVStream_StreamLen() const {

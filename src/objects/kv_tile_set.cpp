@@ -2,8 +2,8 @@
 
 #include <cstddef>
 #include <limits>
-#include <new>
 
+#include "automation/detail/failure.hpp"
 #include "kvdata/automation/ansi.hpp"
 #include "kvdata/automation/error.hpp"
 #include "kvdata/objects/kv_tile.hpp"
@@ -97,7 +97,7 @@ Long KVTileSet::IKVTileSet_count() const {
 }
 
 bool KVTileSet::IKVStream_StreamIn(const ByteArray& bytStream, Long& Position) {
-  try {
+  return detail::false_on_failure([&] {
     String tsn;
     if (!checked::read_string(bytStream, Position, tsn)) return false;
     record_.TSN = std::move(tsn);
@@ -110,15 +110,11 @@ bool KVTileSet::IKVStream_StreamIn(const ByteArray& bytStream, Long& Position) {
       if (is_tile_index(i)) record_.Tiles(static_cast<Long>(i)) = detail::decode_tile(block);
     }
     return true;
-  } catch (const Error&) {
-    return false;
-  } catch (const std::bad_alloc&) {
-    return false;
-  }
+  });
 }
 
 bool KVTileSet::IKVStream_StreamOut(ByteArray& bytStream, Long& Position) {
-  try {
+  return detail::false_on_failure([&] {
     if (Position < 0) return false;  // before any array a writer makes
     const std::size_t tiles = record_.Tiles.has_bounds() ? record_.Tiles.size() : 0;
     const std::size_t total = tsn_field_bytes(record_.TSN) + tiles * detail::kTileBlockBytes;
@@ -132,11 +128,7 @@ bool KVTileSet::IKVStream_StreamOut(ByteArray& bytStream, Long& Position) {
       if (!detail::put_block(bytStream, Position, block)) return false;
     }
     return true;
-  } catch (const Error&) {
-    return false;
-  } catch (const std::bad_alloc&) {
-    return false;
-  }
+  });
 }
 
 Long KVTileSet::IKVStream_StreamLen() const {

@@ -1,9 +1,9 @@
 #include "kvdata/objects/kv_tol_set.hpp"
 
 #include <algorithm>
-#include <exception>
 #include <limits>
 
+#include "automation/detail/failure.hpp"
 #include "kvdata/automation/error.hpp"
 #include "kvdata/automation/text.hpp"
 #include "objects/detail/object_stream.hpp"
@@ -171,7 +171,7 @@ Long KVTolSet::IKVStream_StreamLen() const {
 }
 
 bool KVTolSet::IKVStream_StreamOut(ByteArray& bytStream, Long& Position) {
-  try {
+  return detail::false_on_failure([&] {
     record_member_count();
     std::array<Byte, kHeaderStreamBytes> image{};  // the trailing byte stays 0
     std::copy(header_.begin(), header_.end(), image.begin());
@@ -187,13 +187,11 @@ bool KVTolSet::IKVStream_StreamOut(ByteArray& bytStream, Long& Position) {
       if (!stream || !stream->StreamOut(bytStream, Position)) return false;
     }
     return true;
-  } catch (const std::exception&) {
-    return false;
-  }
+  });
 }
 
 bool KVTolSet::IKVStream_StreamIn(const ByteArray& bytStream, Long& Position) {
-  try {
+  return detail::false_on_failure([&] {
     clear_members();
     std::array<Byte, kHeaderStreamBytes> image{};
     if (!detail::take_block(bytStream, Position, image)) return false;
@@ -208,9 +206,7 @@ bool KVTolSet::IKVStream_StreamIn(const ByteArray& bytStream, Long& Position) {
       IKVTolSet_Add(tol, id_key(tol->ID()));
     }
     return true;
-  } catch (const std::exception&) {
-    return false;
-  }
+  });
 }
 
 }  // namespace kvdata

@@ -2,9 +2,9 @@
 
 #include <array>
 #include <cassert>
-#include <new>
 #include <span>
 
+#include "automation/detail/failure.hpp"
 #include "kvdata/automation/error.hpp"
 #include "kvdata/automation/text.hpp"
 #include "kvdata/streams/field_codec.hpp"
@@ -94,6 +94,14 @@ tUser decode(const Block& block) {
   return user;
 }
 
+// The user's failure policy: False, with the failure's description in ErrMsg.
+auto keeping_message_in(String& err_msg) {
+  return [&err_msg](Long number, const Error* e) {
+    err_msg = e != nullptr ? e->description() : standard_description(number);
+    return false;
+  };
+}
+
 }  // namespace
 
 std::shared_ptr<KVUser> KVUser::create() {
@@ -118,7 +126,7 @@ Long KVUser::IKVStream_StreamLen() const {
 }
 
 bool KVUser::IKVStream_StreamOut(ByteArray& bytStream, Long& Position) {
-  try {
+  return detail::on_failure(keeping_message_in(err_msg_), [&] {
     if (Position < 0) {
       raise(kPositionInvalid, kSourceOut, u"Position value was not initialized properly");
     }
@@ -130,17 +138,11 @@ bool KVUser::IKVStream_StreamOut(ByteArray& bytStream, Long& Position) {
       raise(kSubscriptOutOfRange);
     }
     return true;
-  } catch (const Error& e) {
-    err_msg_ = e.description();
-    return false;
-  } catch (const std::bad_alloc&) {
-    err_msg_ = standard_description(kOutOfMemory);
-    return false;
-  }
+  });
 }
 
 bool KVUser::IKVStream_StreamIn(const ByteArray& bytStream, Long& Position) {
-  try {
+  return detail::on_failure(keeping_message_in(err_msg_), [&] {
     // The array must reach one index beyond the encoding, as StreamOut leaves it.
     if (static_cast<long long>(bytStream.ubound()) <
         static_cast<long long>(Position) + static_cast<long long>(kStreamBytes)) {
@@ -155,13 +157,7 @@ bool KVUser::IKVStream_StreamIn(const ByteArray& bytStream, Long& Position) {
     if (!detail::take_block(bytStream, Position, block)) raise(kSubscriptOutOfRange);
     user_ = decode(block);
     return true;
-  } catch (const Error& e) {
-    err_msg_ = e.description();
-    return false;
-  } catch (const std::bad_alloc&) {
-    err_msg_ = standard_description(kOutOfMemory);
-    return false;
-  }
+  });
 }
 
 }  // namespace kvdata

@@ -4,6 +4,7 @@
 #include <string>
 #include <utility>
 
+#include "automation/detail/failure.hpp"
 #include "kvdata/automation/error.hpp"
 
 namespace kvdata {
@@ -70,6 +71,11 @@ Bounds first_dimension(const Variant& v) {
 String decimal(Long n) {
   const std::string digits = std::to_string(n);
   return String(digits.begin(), digits.end());
+}
+
+// The failure policy of Initialize and Copy: any failure answers CaughtError.
+Integer caught_error(Long, const Error*) {
+  return KVTestRunSpreadTestData::kCaughtError;
 }
 
 }  // namespace
@@ -255,7 +261,7 @@ void KVTestRunSpreadTestData::dimension_tables(Long points) {
 }
 
 Integer KVTestRunSpreadTestData::KVRR_Initialize(const Integer& nNumberOfSpectralDataPts) {
-  try {
+  return detail::on_failure(caught_error, [&] {
     points_ = nNumberOfSpectralDataPts;
     current_test_index_ = 0;
     if (points_ < 1) return kNotReady;
@@ -264,13 +270,11 @@ Integer KVTestRunSpreadTestData::KVRR_Initialize(const Integer& nNumberOfSpectra
     dimension_tables(points_);
     initialised_ = true;
     return kSuccess;
-  } catch (const Error&) {
-    return kCaughtError;
-  }
+  });
 }
 
 Integer KVTestRunSpreadTestData::KVRR_Copy(std::shared_ptr<KVTestRunSpreadTestData> obj) {
-  try {
+  return detail::on_failure(caught_error, [&] {
     if (!obj) raise(kObjectNotSet);
     points_ = obj->KVRR_GetNumberOfSpectralDataPoints();
     current_test_index_ = 0;
@@ -284,9 +288,7 @@ Integer KVTestRunSpreadTestData::KVRR_Copy(std::shared_ptr<KVTestRunSpreadTestDa
     std_dev_ = obj->KVRR_GetStdDev().get<Array<Single>>();
     initialised_ = true;
     return kSuccess;
-  } catch (const Error&) {
-    return kCaughtError;
-  }
+  });
 }
 
 Integer KVTestRunSpreadTestData::KVRR_ReleaseSpreadTestData() {

@@ -4,14 +4,13 @@
 
 #include "kvdata/streams/field_codec.hpp"
 
-#include <new>
 #include <optional>
 #include <span>
-#include <stdexcept>
 #include <string_view>
 #include <utility>
 #include <vector>
 
+#include "automation/detail/failure.hpp"
 #include "kvdata/automation/ansi.hpp"
 #include "kvdata/automation/error.hpp"
 #include "kvdata/automation/event_log.hpp"
@@ -91,16 +90,15 @@ void log_standard_failure(const Compose& compose, Long number) {
 // its own entry) and logs the trapped failure as composed by `compose`.
 template <class Body, class Compose>
 bool trap(const Body& body, const Compose& compose) {
-  try {
-    return body();
-  } catch (const Error& e) {
-    log_failure(compose, e);
-  } catch (const std::bad_alloc&) {
-    log_standard_failure(compose, kOutOfMemory);
-  } catch (const std::length_error&) {
-    log_standard_failure(compose, kOutOfMemory);
-  }
-  return false;
+  const auto log = [&](Long number, const Error* e) {
+    if (e != nullptr) {
+      log_failure(compose, *e);
+    } else {
+      log_standard_failure(compose, number);
+    }
+    return false;
+  };
+  return detail::on_failure(log, body);
 }
 
 // Makes indices position .. position + width - 1 exist: the array grows to

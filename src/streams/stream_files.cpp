@@ -7,9 +7,7 @@
 #include <cstdio>
 #include <filesystem>
 #include <memory>
-#include <new>
 #include <random>
-#include <stdexcept>
 #include <string>
 #include <system_error>
 #include <utility>
@@ -19,7 +17,7 @@
 #define KVDATA_HAVE_FSYNC 1
 #endif
 
-#include "kvdata/automation/error.hpp"
+#include "automation/detail/failure.hpp"
 #include "kvdata/automation/text.hpp"
 #include "kvdata/streams/streams.hpp"
 #include "streams/detail/little_endian.hpp"
@@ -102,27 +100,14 @@ bool load(const String& filename, ByteArray& bytes) {
   return true;
 }
 
-// Every failure of a file operation answers False; nothing is logged.
-template <class Operation>
-bool trapped(const Operation& operation) {
-  try {
-    return operation();
-  } catch (const Error&) {
-  } catch (const std::bad_alloc&) {
-  } catch (const std::length_error&) {
-  } catch (const std::system_error&) {
-  }
-  return false;
-}
-
 }  // namespace
 
 bool Streams::StreamSave(const String& Filename, const ByteArray& a) {
-  return trapped([&] { return save(Filename, a); });
+  return detail::false_on_failure([&] { return save(Filename, a); });
 }
 
 bool Streams::StreamLoad(const String& Filename, ByteArray& a) {
-  return trapped([&] { return load(Filename, a); });
+  return detail::false_on_failure([&] { return load(Filename, a); });
 }
 
 }  // namespace kvdata

@@ -4,32 +4,17 @@
 
 #include "kvdata/streams/streams.hpp"
 
-#include <new>
-#include <stdexcept>
-
-#include "kvdata/automation/error.hpp"
+#include "automation/detail/failure.hpp"
 #include "streams/detail/record_streams.hpp"
 
 namespace kvdata {
 namespace {
 
-// Runs `operation` and turns any failure it raises into False.
-template <class Operation>
-bool trapped(const Operation& operation) {
-  try {
-    return operation();
-  } catch (const Error&) {
-  } catch (const std::bad_alloc&) {
-  } catch (const std::length_error&) {
-  }
-  return false;
-}
-
 // ToStream runs the writer, FromStream the reader; any other Direction
 // does nothing and answers False.
 template <class Write, class Read>
 bool dispatch(const eStreamDirection& direction, const Write& write, const Read& read) {
-  return trapped([&] {
+  return detail::false_on_failure([&] {
     switch (direction) {
       case eStreamDirection::ToStream:
         return write();
@@ -101,11 +86,13 @@ bool Streams::Stream_Organization(const eStreamDirection& Direction, ByteArray& 
 }
 
 bool Streams::StreamOrgTo(const tOrganization& Org, ByteArray& Stream, Long& Position) {
-  return trapped([&] { return detail::write_organization_block(Org, Stream, Position); });
+  return detail::false_on_failure(
+      [&] { return detail::write_organization_block(Org, Stream, Position); });
 }
 
 bool Streams::StreamOrgFrom(tOrganization& Org, const ByteArray& Stream, Long& Position) {
-  return trapped([&] { return detail::read_organization_block(Stream, Position, Org); });
+  return detail::false_on_failure(
+      [&] { return detail::read_organization_block(Stream, Position, Org); });
 }
 
 }  // namespace kvdata

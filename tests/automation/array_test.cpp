@@ -3,6 +3,7 @@
 #include <gtest/gtest.h>
 
 #include <iterator>
+#include <limits>
 #include <utility>
 
 #include "support/error_number.hpp"
@@ -151,6 +152,57 @@ TEST(Array, SpareElementsStayOutsideTheBoundsAndComeBackZero) {
   texts.redim_preserve(1, 2);
   EXPECT_TRUE(texts.try_extend(3));
   EXPECT_EQ(texts(3), u"");
+}
+
+// Bounds anywhere in the Long range: every element that both bounds hold
+// keeps its value (index i holds the low byte of i), every new one is zero,
+// and a refused request leaves the array as it was.
+TEST(Array, RedimPreserveIsExactAtTheEdgesOfLong) {
+  constexpr Long kMax = std::numeric_limits<Long>::max();
+  constexpr Long kMin = std::numeric_limits<Long>::min();
+  struct Case {
+    Bounds from;
+    Bounds to;
+    Long error;
+  };
+  const Case cases[] = {
+      {{kMax - 5, kMax}, {kMax - 1, kMax}, 0},  // a new lower bound, ending at the top
+      {{kMax - 1, kMax - 1}, {kMax - 1, kMax}, 0},
+      {{kMax - 2, kMax}, {kMax - 3, kMax}, 0},
+      {{kMax - 2, kMax}, {kMax, kMax - 1}, 0},  // dimensioned, no elements
+      {{kMin, kMin + 5}, {kMin, kMin + 1}, 0},
+      {{kMin, kMin + 5}, {kMin + 3, kMin + 8}, 0},
+      {{kMin, kMin + 2}, {kMax - 2, kMax}, 0},  // no index in common
+      {{kMax - 2, kMax}, {kMax, kMax - 2}, kSubscriptOutOfRange},
+      {{0, 3}, {kMin, kMax}, kOutOfMemory},  // 2^32 elements
+      {{0, 3}, {-1, kMax}, kOutOfMemory},    // 2^31 + 1
+  };
+  for (const Case& c : cases) {
+    ByteArray a(c.from.lower, c.from.upper);
+    for (Byte& b : a) b = static_cast<Byte>(c.from.lower + (&b - a.data()));
+    const ByteArray before = a;
+    EXPECT_EQ(error_number([&] { a.redim_preserve(c.to.lower, c.to.upper); }), c.error)
+        << c.to.lower << ".." << c.to.upper;
+    if (c.error != 0) {
+      EXPECT_TRUE(a == before);
+      continue;
+    }
+    ASSERT_EQ(a.lbound(), c.to.lower);
+    ASSERT_EQ(a.ubound(), c.to.upper);
+    for (long long i = c.to.lower; i <= c.to.upper; ++i) {
+      const bool kept = i >= c.from.lower && i <= c.from.upper;
+      EXPECT_EQ(a(static_cast<Long>(i)), kept ? static_cast<Byte>(i) : 0) << i;
+    }
+  }
+
+  // Refused before anything is allocated: a two-dimensional preserve, and
+  // sizes beyond what an array may hold.
+  Array<Single> table({{1, 2}, {1, 3}});
+  EXPECT_EQ(error_number([&] { table.redim_preserve(1, 6); }), kSubscriptOutOfRange);
+  EXPECT_EQ(table.rank(), 2);
+  EXPECT_EQ(error_number([&] { table.redim({0, 65535}, {0, 32768}); }), kOutOfMemory);
+  EXPECT_EQ(error_number([] { ByteArray all(kMin, kMax); }), kOutOfMemory);
+  EXPECT_EQ(table.ubound(2), 3);
 }
 
 TEST(Array, CopiesAreIndependentValues) {

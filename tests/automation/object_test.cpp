@@ -49,7 +49,9 @@ TEST(Object, UnknownNamesCannotBeCreated) {
     EXPECT_EQ(e.number(), kCannotCreateObject);
     EXPECT_EQ(e.description(), u"Cannot create object");
     EXPECT_EQ(e.source(), u"KVData");
+    EXPECT_STREQ(e.what(), "KVData: Cannot create object (error 429)");
   }
+  EXPECT_STREQ(Error(kSubscriptOutOfRange, u"", u"x").what(), "x (error 9)");
 }
 
 }  // namespace

@@ -4,7 +4,9 @@
 
 #include "support/error_number.hpp"
 
+#include <cstddef>
 #include <limits>
+#include <type_traits>
 
 namespace kvdata {
 namespace {
@@ -28,6 +30,23 @@ TEST(Variant, TypeTagsUseTheAutomationNumbers) {
   EXPECT_EQ(static_cast<int>(Variant(Array<Single>()).type()), 8192 + 4);
   EXPECT_EQ(static_cast<int>(Variant(Array<Variant>(1, 2)).type()), 8192 + 12);
   EXPECT_TRUE(Variant().is_empty());
+}
+
+// Nothing becomes a Variant of another kind than it says: narrow text,
+// pointers and null have no automation kind, and a character is no number.
+TEST(Variant, OnlyValuesOfAnAutomationKindConvert) {
+  static_assert(!std::is_constructible_v<Variant, const char*>);
+  static_assert(!std::is_constructible_v<Variant, char*>);
+  static_assert(!std::is_constructible_v<Variant, decltype("abc")>);
+  static_assert(!std::is_constructible_v<Variant, std::nullptr_t>);
+  static_assert(!std::is_constructible_v<Variant, const Tracked*>);
+  static_assert(!std::is_constructible_v<Variant, void (*)()>);
+  static_assert(!std::is_constructible_v<Variant, char>);
+  static_assert(!std::is_constructible_v<Variant, char16_t>);
+  static_assert(!std::is_constructible_v<Variant, wchar_t>);
+  EXPECT_EQ(Variant(static_cast<const char16_t*>(nullptr)), Variant(String()));
+  EXPECT_EQ(Variant(5).type(), VarType::Long);
+  EXPECT_EQ(Variant(short{5}).type(), VarType::Integer);
 }
 
 TEST(Variant, TypedAccessRaisesThirteenForAnotherType) {

@@ -126,10 +126,12 @@ TEST(CommandStreams, ADamagedCopyOfEachExampleIsExplainedToTheRightField) {
         bytes.resize(at + static_cast<std::size_t>(d.value));
         break;
       case Damage::SetLong:
-        for (int i = 0; i < 4; ++i) bytes[at + i] = static_cast<char>((d.value >> (8 * i)) & 0xFF);
+        for (std::size_t i = 0; i < 4; ++i)
+          bytes[at + i] = static_cast<char>((d.value >> (8 * i)) & 0xFF);
         break;
       case Damage::SetInteger:
-        for (int i = 0; i < 2; ++i) bytes[at + i] = static_cast<char>((d.value >> (8 * i)) & 0xFF);
+        for (std::size_t i = 0; i < 2; ++i)
+          bytes[at + i] = static_cast<char>((d.value >> (8 * i)) & 0xFF);
         break;
       case Damage::FlipByte:
         bytes[at + static_cast<std::size_t>(d.value)] ^= 0x20;

@@ -72,7 +72,7 @@ TEST(StreamingParts, CsvRecordsInPiecesAsWhole) {
   const std::string body = "#;\n" + text.substr(text.find('\n') + 1);
   const auto all = records_of(CsvRecords("t.csv", std::string_view(body)));
   ASSERT_EQ(all, expected);
-  for (std::size_t step : {1, 2, 3, 7}) {
+  for (std::size_t step : {1u, 2u, 3u, 7u}) {
     EXPECT_EQ(records_of(CsvRecords("t.csv", trickle(body, step))), expected) << step;
     // Blocks smaller than a record: the buffer grows and keeps its place.
     EXPECT_EQ(records_of(CsvRecords("t.csv", trickle(body, step), 4)), expected) << step;
@@ -87,7 +87,7 @@ TEST(StreamingParts, CsvRecordsInPiecesAsWhole) {
 
   // An open quote names the line it starts on, however the text arrives.
   const std::string open = "a,b\n1,2\n3,\"4\n5\n";
-  for (std::size_t step : {1, 100}) {
+  for (std::size_t step : {1u, 100u}) {
     try {
       records_of(CsvRecords("o.csv", trickle(open, step)));
       ADD_FAILURE() << "no error";

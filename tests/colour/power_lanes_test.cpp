@@ -8,6 +8,7 @@
 
 #include <bit>
 #include <cmath>
+#include <cstddef>
 #include <cstdint>
 
 namespace kvdata::detail::d65_10 {
@@ -27,14 +28,14 @@ Walk walk(std::uint32_t first, std::uint32_t last, std::uint32_t stride) {
   SingleLanes r, f, l;
   DoubleLanes p;
   for (std::uint64_t u = first; u <= last;) {
-    int n = 0;
+    std::size_t n = 0;
     for (; n < kLanes && u <= last; ++n, u += stride) {
       r[n] = std::bit_cast<Single>(static_cast<std::uint32_t>(u));
     }
-    for (int i = n; i < kLanes; ++i) r[i] = 1.0f;
+    for (std::size_t i = n; i < kLanes; ++i) r[i] = 1.0f;
     w.redone += static_cast<std::uint64_t>(exact_power_lanes(r, f, l));
     estimate_power_lanes(r, p);
-    for (int i = 0; i < n; ++i) {
+    for (std::size_t i = 0; i < n; ++i) {
       ++w.checked;
       const Double e = power(r[i]);
       w.worst = std::fmax(w.worst, std::fabs(p[i] - e) / e);
@@ -69,7 +70,7 @@ TEST(PowerLanes, LanesAtOrBelowTheThresholdAreLeftToTheLinearBranch) {
   r[3] = std::bit_cast<Single>(0x7F800000u);  // infinity
   r[4] = 0.0f;
   EXPECT_EQ(exact_power_lanes(r, f, l), 0);
-  for (int i = 0; i < 5; ++i) EXPECT_TRUE(std::isfinite(f[i])) << i;
+  for (std::size_t i = 0; i < 5; ++i) EXPECT_TRUE(std::isfinite(f[i])) << i;
   EXPECT_EQ(f[5], lab_f(0.5f, power(0.5f)));
 }
 

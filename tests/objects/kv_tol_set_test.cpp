@@ -267,6 +267,17 @@ TEST(KVTolSet, AddAndRemoveRaiseToTheCaller) {
       5);
 }
 
+TEST(KVTolSet, SharedNamesOnTheClassAreTheSetsOwn) {
+  const auto set = KVTolSet::create();
+  set->ID(7);
+  set->InstTypeID(3);
+  set->Description(u"Bench");
+  EXPECT_EQ(set->ID(), 7);
+  EXPECT_EQ(set->Description(), Variant(u"Bench"));
+  EXPECT_EQ(kvdata::query<IKVObj>(set)->ID(), Variant(Long{3}));
+  EXPECT_EQ(kvdata::query<IKVObj>(set)->Description(), u"Tolerance Set");
+}
+
 TEST(KVTolSet, IdentityAndInertInterfaces) {
   auto object = kvdata::CreateObject(u"KVData.KVTolSet");
   const auto set = kvdata::query<IKVTolSet>(object);

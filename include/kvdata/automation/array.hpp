@@ -118,8 +118,10 @@ class Array {
   T& operator()(Long i, Long j) { return items_[offset(i, j)]; }
   const T& operator()(Long i, Long j) const { return items_[offset(i, j)]; }
 
-  // New bounds, contents discarded (all elements value-initialised).
-  // An upper bound below lower - 1 raises error 9; no memory raises error 7.
+  // New bounds, contents discarded (all elements value-initialised). Any
+  // bounds that are Longs count correctly. An upper bound below lower - 1
+  // raises error 9; more than 2^31 elements in all, or no memory, raises
+  // error 7; a refused request allocates nothing and changes nothing.
   void redim(Long lower, Long upper) {
     const std::size_t n = count(Bounds{lower, upper});
     std::vector<T> fresh;
@@ -143,7 +145,8 @@ class Array {
 
   // New one-dimensional bounds keeping the elements whose indices stay inside
   // them; new elements are value-initialised. An array without bounds gets
-  // them. On failure (error 9 or 7) the array is unchanged.
+  // them. A two-dimensional array raises error 9 before anything is
+  // allocated. On failure (error 9 or 7) the array is unchanged.
   void redim_preserve(Long lower, Long upper) {
     if (rank_ == 1 && lower == dims_[0].lower && try_extend(upper)) return;
     redim_preserve_elsewhere(lower, upper);
@@ -187,7 +190,9 @@ class Array {
   }
 
  private:
-  static std::size_t max_elements() { return std::size_t{1} << 31; }
+  // The most elements of any array, all dimensions together: as many as a
+  // Long can count from a lower bound (2^31), so that Positions reach them all.
+  static constexpr std::size_t max_elements() { return std::size_t{1} << 31; }
 
   // The bounds are gone; the storage (if any is left) stays value-initialised.
   void forget() {
@@ -214,15 +219,19 @@ class Array {
       dims_[0].upper = upper;
       return;
     }
+    if (rank_ == 2) raise(kSubscriptOutOfRange);
     std::vector<T> fresh;
     allocate(fresh, n);
-    if (rank_ == 2) raise(kSubscriptOutOfRange);
     if (rank_ == 1) {
+      // The indices that both bounds hold, counted without a Long index
+      // that could step past the top of the range.
       const Long from = std::max(lower, dims_[0].lower);
       const Long to = std::min(upper, dims_[0].upper);
-      for (Long i = from; i <= to && from <= to; ++i) {
-        fresh[static_cast<std::size_t>(static_cast<long long>(i) - lower)] =
-            std::move(items_[static_cast<std::size_t>(static_cast<long long>(i) - dims_[0].lower)]);
+      if (from <= to) {
+        const auto kept = count(Bounds{from, to});
+        std::move(begin() + distance(dims_[0].lower, from),
+                  begin() + distance(dims_[0].lower, from) + static_cast<std::ptrdiff_t>(kept),
+                  fresh.begin() + distance(lower, from));
       }
     }
     items_ = std::move(fresh);
@@ -231,10 +240,19 @@ class Array {
     rank_ = 1;
   }
 
+  // Elements between the bounds: error 9 for an upper bound below lower - 1,
+  // error 7 beyond the most an array may hold, before anything is allocated.
+  // Bounds are widened first, so every pair of Longs counts correctly.
   static std::size_t count(Bounds b) {
     const long long n = static_cast<long long>(b.upper) - b.lower + 1;
     if (n < 0) raise(kSubscriptOutOfRange);
+    if (static_cast<unsigned long long>(n) > max_elements()) raise(kOutOfMemory);
     return static_cast<std::size_t>(n);
+  }
+
+  // Index `i` counted from `lower` (i >= lower).
+  static std::ptrdiff_t distance(Long lower, Long i) {
+    return static_cast<std::ptrdiff_t>(static_cast<long long>(i) - lower);
   }
 
   static void allocate(std::vector<T>& v, std::size_t n) {

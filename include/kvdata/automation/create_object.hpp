@@ -2,6 +2,8 @@
 // Creation of the library's creatable classes by name.
 //
 //   auto user = kvdata::CreateObject(u"KVData.KVUser");   // error 429 for other names
+//
+// Threads: both functions may be called from any number of threads at once.
 
 #include <memory>
 #include <span>

@@ -18,6 +18,7 @@ inline constexpr Long kOutOfMemory = 7;
 inline constexpr Long kSubscriptOutOfRange = 9;
 inline constexpr Long kTypeMismatch = 13;
 inline constexpr Long kObjectNotSet = 91;
+inline constexpr Long kInternalError = 51;
 inline constexpr Long kInvalidUseOfNull = 94;
 inline constexpr Long kCannotCreateObject = 429;
 inline constexpr Long kDuplicateKey = 457;
@@ -25,7 +26,8 @@ inline constexpr Long kDuplicateKey = 457;
 // Source of errors that name no operation of their own.
 inline constexpr char16_t kDefaultErrorSource[] = u"KVData";
 
-// A thrown automation error. `what()` is the description in UTF-8.
+// A thrown automation error. `what()` names all three in UTF-8, for logs and
+// messages: "KVData.ILU_D6510.calcXYZ: Subscript out of range (error 9)".
 class Error : public std::exception {
  public:
   Error(Long number, String source, String description);

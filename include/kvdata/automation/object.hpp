@@ -15,6 +15,11 @@ namespace kvdata {
 // Base of every class and interface of the library. Objects live in
 // std::shared_ptr (the reference count); interfaces derive from Object
 // virtually so that any interface pointer can be queried for another.
+//
+// Threads: an object is used by one thread at a time. Different objects may
+// be used on different threads at once; one object shared by threads (and
+// likewise an Array, a record or a Variant) needs the caller's lock around
+// every call, reads included. Copying and releasing the shared_ptr is safe.
 class Object : public std::enable_shared_from_this<Object> {
  public:
   virtual ~Object() = default;

@@ -6,8 +6,11 @@
 //   v.to_string() == u"5";   v.type() == kvdata::VarType::Long;
 //   v.get<kvdata::String>();  // raises error 13: it holds a Long
 
+#include <concepts>
+#include <cstddef>
 #include <memory>
 #include <string_view>
+#include <type_traits>
 #include <typeinfo>
 #include <utility>
 #include <variant>
@@ -51,6 +54,11 @@ concept VariantRecord = requires {
 class Variant;
 
 namespace detail {
+
+template <class T>
+inline constexpr bool is_character_v =
+    std::is_same_v<T, char> || std::is_same_v<T, wchar_t> || std::is_same_v<T, char8_t> ||
+    std::is_same_v<T, char16_t> || std::is_same_v<T, char32_t>;
 
 // Type-erased record held by a Variant; copied deeply with the Variant.
 class RecordHolder {
@@ -137,10 +145,22 @@ class Variant {
   Variant(Double v) : value_(v) {}
   Variant(Date v) : value_(v) {}
   Variant(String v) : value_(std::move(v)) {}
-  Variant(const char16_t* v) : value_(String(v)) {}
+  // A null pointer is the empty String.
+  Variant(const char16_t* v) : value_(v != nullptr ? String(v) : String()) {}
   Variant(std::u16string_view v) : value_(String(v)) {}
-  Variant(bool v) : value_(v) {}
+  // A Boolean only from a bool itself: a pointer, or anything else that
+  // converts to bool, does not quietly become one.
+  template <std::same_as<bool> B>
+  Variant(B v) : value_(v) {}
   Variant(Byte v) : value_(v) {}
+  // Narrow text has no agreed encoding: write u"..." or convert it first.
+  Variant(const char*) = delete;
+  Variant(std::nullptr_t) = delete;
+  // A character is not a number: char, wchar_t, char8_t, char16_t and
+  // char32_t would otherwise become Longs.
+  template <class C>
+  requires detail::is_character_v<C> Variant(C)
+  = delete;
   template <class T>
   requires std::is_base_of_v<Object, T> Variant(std::shared_ptr<T> v)
       : value_(ObjectRef(std::move(v))) {}

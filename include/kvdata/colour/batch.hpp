@@ -6,6 +6,9 @@
 //
 //   std::vector<float> xyz(3 * n), lab(3 * n);
 //   kvdata::calc_xyz_lab_d6510(bands, xyz, lab);   // bands: 40 * n values
+//
+// Threads: any number of threads may convert at once, each into results of
+// its own; the tables they share are constant.
 
 #include <cstddef>
 #include <span>

@@ -18,6 +18,10 @@ namespace kvdata {
 // rounded to Single after every band; negative sums become 0. A ratio to
 // the white point above 0.008856 (strictly) takes the power 0.33333331,
 // anything else the linear branch.
+//
+// Threads: the const members (calcXYZ, calcLAB, XYZ, Weights, ...) may run
+// on one object from any number of threads at once; Reflectance changes the
+// object and needs the caller's lock when the object is shared.
 class ILU_D6510 final : public IIlluminant {
  public:
   static std::shared_ptr<ILU_D6510> create();

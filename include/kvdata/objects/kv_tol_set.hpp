@@ -5,7 +5,9 @@
 // placeholder tolerance named "MISSING" instead of failing.
 //
 //   auto set = kvdata::KVTolSet::create();
+//   set->ID(7);  set->Description(u"Bench spectrophotometers");   // IKVTolSet's
 //   set->Add(tol, u"5");  set->Item(kvdata::Long{5})->MaxFail();   // key "5"
+//   kvdata::query<kvdata::IKVObj>(set)->Description();             // "Tolerance Set"
 
 #include <array>
 #include <cstddef>
@@ -69,6 +71,12 @@ class KVTolSet final : public InertDBObject,
   static std::shared_ptr<KVTolSet> create();
 
   KVTolSet();
+
+  // ID and Description are named by both IKVObj and IKVTolSet; on the set
+  // they are the tolerance set's own, and the identity ones are reached
+  // through query<IKVObj>(set).
+  using IKVTolSet::Description;
+  using IKVTolSet::ID;
 
   // The members in insertion order, for range-for.
   const_iterator begin() const { return members_.begin(); }

@@ -5,6 +5,8 @@
 // Most records are sequences of field-codec values; users and organisations
 // are fixed-size blocks of a flat image with fixed-width UTF-16 text.
 // The class has no state; `Streams::instance()` is its predeclared instance.
+// Threads: any number of threads may call it, the predeclared instance
+// included, at once, each with arrays and records of its own.
 //
 //   kvdata::ByteArray bytes(0, -1);  kvdata::Long pos = 0;
 //   kvdata::Streams::instance().Stream_Station(kvdata::eStreamDirection::ToStream, bytes, pos, st);

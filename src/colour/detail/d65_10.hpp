@@ -8,14 +8,15 @@
 
 #include <array>
 #include <cmath>
+#include <cstddef>
 
 #include "kvdata/automation/error.hpp"
 #include "kvdata/automation/types.hpp"
 
 namespace kvdata::detail::d65_10 {
 
-inline constexpr int kComponents = 3;
-inline constexpr int kBands = 40;
+inline constexpr std::size_t kComponents = 3;
+inline constexpr std::size_t kBands = 40;
 
 // Weighting factors before division by 100, [component][band - 1]. The
 // values are written as Singles: the table is held in single precision.
@@ -50,7 +51,7 @@ inline constexpr Double kLinearOffset = 16.0 / 116.0;
 
 // A stored weight: the Single table value divided by 100 in double
 // precision, rounded to Single. `band` is 1..40.
-constexpr Single weight(int component, int band) {
+constexpr Single weight(std::size_t component, std::size_t band) {
   return static_cast<Single>(static_cast<Double>(kTable[component][band - 1]) / 100.0);
 }
 
@@ -67,7 +68,7 @@ inline Single clamp_sum(Single sum) {
 }
 
 // A component's ratio to the white point, rounded to Single.
-inline Single ratio(Single value, int component) {
+inline Single ratio(Single value, std::size_t component) {
   return static_cast<Single>(static_cast<Double>(value) /
                              static_cast<Double>(kWhitePoint[component]));
 }

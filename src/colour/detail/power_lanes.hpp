@@ -16,6 +16,7 @@
 
 #include <array>
 #include <bit>
+#include <cstddef>
 #include <cstdint>
 
 #include "colour/detail/d65_10.hpp"
@@ -23,7 +24,7 @@
 
 namespace kvdata::detail::d65_10 {
 
-inline constexpr int kLanes = 16;
+inline constexpr std::size_t kLanes = 16;
 using SingleLanes = std::array<Single, kLanes>;
 using DoubleLanes = std::array<Double, kLanes>;
 using FlagLanes = std::array<std::int32_t, kLanes>;
@@ -48,11 +49,11 @@ inline void estimate_power_lanes(const SingleLanes& ratio, DoubleLanes& p) {
   // Chosen in a loop of its own, so that the one below is straight-line
   // code without branches, which the compiler vectorises.
   SingleLanes xs;
-  for (int i = 0; i < kLanes; ++i) {
+  for (std::size_t i = 0; i < kLanes; ++i) {
     const bool usable = (int{ratio[i] > kThreshold} & int{ratio[i] <= kHighest}) != 0;
     xs[i] = usable ? ratio[i] : 1.0f;
   }
-  for (int i = 0; i < kLanes; ++i) {
+  for (std::size_t i = 0; i < kLanes; ++i) {
     const Single x = xs[i];
     const auto u = std::bit_cast<std::int32_t>(x);
     const auto a = static_cast<Double>(x);
@@ -91,7 +92,7 @@ inline int exact_power_lanes(const SingleLanes& ratio, SingleLanes& f, SingleLan
   alignas(64) DoubleLanes p;
   estimate_power_lanes(ratio, p);
   alignas(64) FlagLanes settled;
-  for (int i = 0; i < kLanes; ++i) {
+  for (std::size_t i = 0; i < kLanes; ++i) {
     const Double lo = p[i] - p[i] * kSlack;
     const Double hi = p[i] + p[i] * kSlack;
     const auto f_lo = static_cast<Single>(lo);
@@ -103,7 +104,7 @@ inline int exact_power_lanes(const SingleLanes& ratio, SingleLanes& f, SingleLan
     settled[i] = static_cast<std::int32_t>(f_lo == f_hi) & static_cast<std::int32_t>(l_lo == l_hi);
   }
   int redone = 0;
-  for (int i = 0; i < kLanes; ++i) {
+  for (std::size_t i = 0; i < kLanes; ++i) {
     if (settled[i] != 0 || !above_threshold(ratio[i])) continue;
     const Double exact = power(ratio[i]);
     f[i] = lab_f(ratio[i], exact);

@@ -317,8 +317,8 @@ class Reference {
         used_ = 0;
         if (!stream_.next(ahead_, std::min(kBlock, n - block_.count))) return false;
       }
-      block_.bands.insert(block_.bands.end(), ahead_.bands.begin() + 40 * used_,
-                          ahead_.bands.begin() + 40 * (used_ + 1));
+      const auto first = ahead_.bands.begin() + static_cast<std::ptrdiff_t>(40 * used_);
+      block_.bands.insert(block_.bands.end(), first, first + 40);
       labels_.push_back(ahead_.labels[used_]);
       ++used_;
       ++block_.count;
@@ -415,7 +415,7 @@ void run_colour(const ColourOptions& o) {
         const Single* ref = reference->lab(i);
         if (std::isnan(ref[0]) || std::isnan(r.lab[3 * i])) {
           const Single nan = std::nanf("");
-          std::fill_n(r.dlab.begin() + 3 * i, 3, nan);
+          std::fill_n(r.dlab.begin() + static_cast<std::ptrdiff_t>(3 * i), 3, nan);
           r.de[i] = nan;
           continue;
         }

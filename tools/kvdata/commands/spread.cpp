@@ -99,7 +99,8 @@ Json tile_json(const TileRows& t, const std::string& file) {
 
 std::vector<Point> points(const std::array<Single, 40>& values) {
   std::vector<Point> p;
-  for (std::size_t i = 0; i < values.size(); ++i) p.emplace_back(360.0 + 10.0 * i, values[i]);
+  for (std::size_t i = 0; i < values.size(); ++i)
+    p.emplace_back(360.0 + 10.0 * static_cast<double>(i), values[i]);
   return p;
 }
 
