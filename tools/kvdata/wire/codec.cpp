@@ -96,13 +96,13 @@ class RecordState final : public StreamState {
   }
 
   void read_members(Fields& f) override {
-    each([&](std::string_view name, auto& record) {
+    each(*this, [&](std::string_view name, auto& record) {
       read_value(f.get(name), std::string(name), record);
     });
   }
 
   void write_members(JsonWriter& w) const override {
-    const_cast<RecordState*>(this)->each([&](std::string_view name, const auto& record) {
+    each(*this, [&](std::string_view name, const auto& record) {
       w.key(name);
       write_value(w, record);
     });
@@ -131,7 +131,7 @@ class RecordState final : public StreamState {
   }
 
   void find_spectra(const SpectrumVisitor& visit) const override {
-    const_cast<RecordState*>(this)->each([&](std::string_view name, const auto& record) {
+    each(*this, [&](std::string_view name, const auto& record) {
       visit_spectra(record, std::string(name), nullptr, nullptr, visit);
     });
   }
@@ -145,10 +145,11 @@ class RecordState final : public StreamState {
         records_);
   }
 
-  template <class F>
-  void each(F&& f) {
+  // f(name, record) for every record; the records are const when `self` is.
+  template <class Self, class F>
+  static void each(Self& self, F&& f) {
     [&]<std::size_t... I>(std::index_sequence<I...>) {
-      (f(names_[I], std::get<I>(records_)), ...);
+      (f(self.names_[I], std::get<I>(self.records_)), ...);
     }
     (std::index_sequence_for<R...>{});
   }
@@ -202,17 +203,14 @@ struct PropertyValues {
   using Properties = std::remove_const_t<decltype(ObjectDescription<Class>::kProperties)>;
   typename ValuesOf<Properties>::type values;
 
-  // f(description, value) for every property.
-  template <class F>
-  void each(F&& f) {
+  // f(description, value) for every property; the values are const when
+  // `self` is.
+  template <class Self, class F>
+  static void each(Self& self, F&& f) {
     [&]<std::size_t... I>(std::index_sequence<I...>) {
-      (f(std::get<I>(ObjectDescription<Class>::kProperties), std::get<I>(values)), ...);
+      (f(std::get<I>(ObjectDescription<Class>::kProperties), std::get<I>(self.values)), ...);
     }
     (std::make_index_sequence<std::tuple_size_v<Properties>>{});
-  }
-  template <class F>
-  void each(F&& f) const {
-    const_cast<PropertyValues*>(this)->each([&](const auto& p, const auto& value) { f(p, value); });
   }
 };
 
@@ -221,7 +219,7 @@ using InterfaceOf = typename ObjectDescription<Class>::Interface;
 
 template <class Class>
 void take_values(const InterfaceOf<Class>& object, PropertyValues<Class>& out) {
-  out.each([&](const auto& p, auto& value) {
+  PropertyValues<Class>::each(out, [&](const auto& p, auto& value) {
     using P = DescriptionOf<decltype(p)>;
     if constexpr (MembersProperty<P>) {
       for (const auto& member : p.members(object)) {
@@ -257,7 +255,7 @@ std::shared_ptr<Class> make_object(PropertyValues<Class>& values, const std::str
                                    StreamKind kind) {
   std::shared_ptr<Class> object = Class::create();
   InterfaceOf<Class>& o = *object;
-  values.each([&](const auto& p, auto& value) {
+  PropertyValues<Class>::each(values, [&](const auto& p, auto& value) {
     using P = DescriptionOf<decltype(p)>;
     const std::string at = member_path(path, p.name);
     if constexpr (MembersProperty<P>) {
@@ -283,7 +281,7 @@ std::shared_ptr<Class> make_object(PropertyValues<Class>& values, const std::str
 
 template <class Class>
 void write_values(JsonWriter& w, const PropertyValues<Class>& values) {
-  values.each([&](const auto& p, const auto& value) {
+  PropertyValues<Class>::each(values, [&](const auto& p, const auto& value) {
     using P = DescriptionOf<decltype(p)>;
     w.key(p.name);
     if constexpr (MembersProperty<P>) {
@@ -302,7 +300,7 @@ void write_values(JsonWriter& w, const PropertyValues<Class>& values) {
 
 template <class Class>
 void read_values(Fields& f, PropertyValues<Class>& values) {
-  values.each([&](const auto& p, auto& value) {
+  PropertyValues<Class>::each(values, [&](const auto& p, auto& value) {
     using P = DescriptionOf<decltype(p)>;
     const std::string at = f.at(p.name);
     const Json& given = f.get(p.name);
@@ -323,7 +321,7 @@ void read_values(Fields& f, PropertyValues<Class>& values) {
 template <class Class>
 void visit_values(const PropertyValues<Class>& values, const std::string& path,
                   const SpectrumVisitor& visit) {
-  values.each([&](const auto& p, const auto& value) {
+  PropertyValues<Class>::each(values, [&](const auto& p, const auto& value) {
     using P = DescriptionOf<decltype(p)>;
     const std::string at = member_path(path, p.name);
     if constexpr (MembersProperty<P>) {
