@@ -27,14 +27,17 @@ std::string member_path(const std::string& path, std::string_view name) {
 
 // --- Spectra ------------------------------------------------------------------------
 
+// Calls `visit` for every spectrum and every pair of spectra inside `v`, at
+// its path in the document. `name` and `colour` are the first text and Long
+// of the record whose field `v` is (a tile's name and display colour).
 template <class Index = void, class T>
 void visit_spectra(const T& v, const std::string& path, const String* name, const Long* colour,
                    const SpectrumVisitor& visit) {
   if constexpr (std::is_same_v<T, tSpectrum>) {
     visit(SpectrumSeries{path, {{"", &v}}, name, colour});
   } else if constexpr (FixedArrayValue<T> && !std::is_void_v<Index>) {
-    SpectrumSeries s{path, {}, name, colour};
     if constexpr (std::is_same_v<typename FixedArrayTraits<T>::element_type, tSpectrum>) {
+      SpectrumSeries s{path, {}, name, colour};
       for (const auto& m : EnumDescription<Index>::kMembers)
         s.lines.emplace_back(m.name, &v(m.value));
       visit(s);
