@@ -161,15 +161,28 @@ TEST(CommandCompute, SpreadReportsTheStatisticsOfEachTile) {
             (std::vector<std::string>{"Blue tile (2 samples)", "White tile (3 samples)"}));
 }
 
-TEST(CommandCompute, PlotDrawsOneSeriesPerTileInWellFormedSvg) {
+TEST(CommandCompute, PlotDrawsEverySpectrumOfTheStreamInWellFormedSvg) {
   Scratch s;
   auto r = kvdata({"plot", example("streams/tileset-calibration.kvs"), "-o", s.path("t.svg")});
   ASSERT_EQ(r.code, 0) << r.err;
   const auto names = svg_series(s.path("t.svg"));
-  ASSERT_EQ(names.size(), 13u);
-  EXPECT_NE(std::find(names.begin(), names.end(), "13. Deep Blue"), names.end());
+  // Each tile's temperature compensation and its calibrated pair.
+  ASSERT_EQ(names.size(), 26u);
+  EXPECT_NE(std::find(names.begin(), names.end(), "TS.Tiles(13).TempComp Deep Blue"), names.end());
+  EXPECT_NE(std::find(names.begin(), names.end(), "TSC.Tiles(13) Deep Blue"), names.end());
   // Tiles are drawn in their display colours: the deep blue tile's is #23328C.
-  EXPECT_NE(slurp(s.path("t.svg")).find("stroke=\"#23328C\""), std::string::npos);
+  const std::string svg = slurp(s.path("t.svg"));
+  EXPECT_EQ(std::count_if(names.begin(), names.end(),
+                          [](const std::string& n) { return n.ends_with("Deep Blue"); }),
+            2);
+  EXPECT_NE(svg.find("stroke=\"#23328C\""), std::string::npos);
+  EXPECT_NE(svg.find("stroke-dasharray"), std::string::npos);
+
+  r = kvdata({"plot", example("streams/profile.kvs"), "-o", s.path("p.svg")});
+  ASSERT_EQ(r.code, 0) << r.err;
+  EXPECT_EQ(svg_series(s.path("p.svg")),
+            (std::vector<std::string>{"BandWidthCorrection", "DarkCorrection", "LinearCorrection",
+                                      "WaveCorrection", "WhiteCorrection"}));
 
   r = kvdata({"plot", "calibration", example("streams/calibration.kvs"), "-o", s.path("c.svg"),
               "--sc", "SCI"});

@@ -260,41 +260,5 @@ TEST(CommandStreams, ATestRunKeepsTheVersionItsStreamCarries) {
   EXPECT_EQ(Json::parse(r.out)["StreamVersion"].dump(), "1.2");
 }
 
-TEST(CommandStreams, EncodeRefusesWhatTheLibraryWouldCutOrCouldNotReadBack) {
-  Scratch s;
-  Json doc = Json::parse(slurp(json_of("calibration")));
-  doc["v1Calibration"]["TSN"] = "CT-4471-B";
-  spill(s.path("c.json"), doc.dump());
-  auto r = kvdata({"encode", s.path("c.json"), "-o", s.path("c.kvs")});
-  EXPECT_EQ(r.code, 1);
-  EXPECT_NE(r.err.find("v1Calibration.TSN: 9 UTF-16 code units, but the field holds 8"),
-            std::string::npos)
-      << r.err;
-
-  doc = Json::parse(slurp(json_of("tileset")));
-  doc["v1TileSet"]["Tiles"].erase(12);
-  spill(s.path("t.json"), doc.dump());
-  r = kvdata({"encode", s.path("t.json"), "-o", s.path("t.kvs")});
-  EXPECT_EQ(r.code, 1);
-  EXPECT_NE(r.err.find("v1TileSet.Tiles: 12 tiles, but a tile set has 13"), std::string::npos)
-      << r.err;
-
-  doc = Json::parse(slurp(json_of("tileset-calibration")));
-  doc["TSC"]["TSN"] = "CT-4472";
-  spill(s.path("tsc.json"), doc.dump());
-  r = kvdata({"encode", s.path("tsc.json"), "-o", s.path("tsc.kvs")});
-  EXPECT_EQ(r.code, 1);
-  EXPECT_NE(r.err.find("TSC.TSN: must equal TS.TSN"), std::string::npos) << r.err;
-
-  doc = Json::parse(slurp(json_of("user-block")));
-  doc["User"]["USERID"] = "joanna.smith";
-  spill(s.path("u.json"), doc.dump());
-  r = kvdata({"encode", s.path("u.json"), "-o", s.path("u.kvs")});
-  EXPECT_EQ(r.code, 1);
-  EXPECT_NE(r.err.find("User.USERID: 12 UTF-16 code units, but the field holds 8"),
-            std::string::npos);
-  EXPECT_FALSE(std::filesystem::exists(s.path("u.kvs")));
-}
-
 }  // namespace
 }  // namespace kvdata::cli

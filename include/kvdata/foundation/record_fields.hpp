@@ -30,7 +30,10 @@ namespace kvdata {
 
 // One field: its name and member. `Index` is the enumeration whose members
 // name the indices of a fixed array (void: plain numbers); `Holds` is the
-// record a Variant field holds (void for other fields).
+// record a Variant field holds (void for other fields). `streamed` is false
+// for a field that no byte stream carries, so that a program showing a
+// stream leaves it out and one reading such a program's output accepts it
+// missing (the field then keeps its initial value).
 template <class Record, class Member, class Index = void, class Holds = void>
 struct FieldDescription {
   using record_type = Record;
@@ -40,6 +43,7 @@ struct FieldDescription {
 
   std::string_view name;
   Member Record::*member;
+  bool streamed = true;
 
   constexpr Member& of(Record& r) const { return r.*member; }
   constexpr const Member& of(const Record& r) const { return r.*member; }
@@ -51,6 +55,13 @@ template <class Index = void, class Record, class Member>
 constexpr FieldDescription<Record, Member, Index> field(std::string_view name,
                                                         Member Record::*member) {
   return {name, member};
+}
+
+// A field that no stream carries: unstreamed_field("LightLevels", ...).
+template <class Index = void, class Record, class Member>
+constexpr FieldDescription<Record, Member, Index> unstreamed_field(std::string_view name,
+                                                                   Member Record::*member) {
+  return {name, member, false};
 }
 
 // A Variant field that holds the record `Holds` when it is not Empty.
@@ -164,8 +175,9 @@ struct RecordDescription<tTestStats> {
 template <>
 struct RecordDescription<tTUD_LightLevels> {
   static constexpr std::string_view kName = "tTUD_LightLevels";
-  static constexpr auto kFields = std::tuple{field("Stats", &tTUD_LightLevels::Stats),
-                                             field("LightLevels", &tTUD_LightLevels::LightLevels)};
+  static constexpr auto kFields =
+      std::tuple{field("Stats", &tTUD_LightLevels::Stats),
+                 unstreamed_field("LightLevels", &tTUD_LightLevels::LightLevels)};
 };
 
 template <>

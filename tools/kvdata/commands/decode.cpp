@@ -3,8 +3,10 @@
 
 #include "commands/commands.hpp"
 #include "commands/stream_args.hpp"
+#include "kvdata/automation/error.hpp"
 #include "support/errors.hpp"
 #include "support/files.hpp"
+#include "support/output_file.hpp"
 #include "wire/codec.hpp"
 #include "wire/explain_render.hpp"
 #include "wire/layouts.hpp"
@@ -28,21 +30,27 @@ std::string field_at(const Walk& walk, std::size_t offset) {
   return "offset " + std::to_string(offset);
 }
 
-// Warns when encoding the decoded document does not give the same bytes.
-void check_round_trip(StreamKind kind, const Json& doc, const std::vector<Byte>& bytes,
-                      const std::string& file) {
-  std::vector<Byte> again;
+// Warns when encoding the decoded document would not give the same bytes:
+// the state written out is what the document holds, so its bytes are those
+// `encode` would make of the document.
+void check_round_trip(StreamState& state, std::span<const Byte> bytes, const std::string& file) {
+  const StreamKind kind = state.kind();
+  ByteArray written;
   try {
-    again = encode_stream(kind, doc);
+    written = state.write_stream(bytes.size());
   } catch (const InputError& e) {
     std::cerr << "kvdata: warning: " << file
               << ": the decoded stream cannot be encoded again: " << e.what() << '\n';
     return;
+  } catch (const Error& e) {
+    std::cerr << "kvdata: warning: " << file
+              << ": the decoded stream cannot be encoded again: " << e.what() << '\n';
+    return;
   }
-  if (again == bytes) return;
+  const std::span<const Byte> again = bytes_of(written);
+  if (std::equal(again.begin(), again.end(), bytes.begin(), bytes.end())) return;
   std::size_t at = 0;
   while (at < again.size() && at < bytes.size() && again[at] == bytes[at]) ++at;
-  const Walk walk = walk_layout(kind, bytes);
   std::string what;
   if (at == bytes.size()) {
     what = "encoding adds " + std::to_string(again.size() - bytes.size()) + " bytes at the end";
@@ -50,6 +58,7 @@ void check_round_trip(StreamKind kind, const Json& doc, const std::vector<Byte>&
     what = "the last " + std::to_string(bytes.size() - again.size()) +
            " bytes are not part of the decoded stream";
   } else {
+    const Walk walk = walk_layout(kind, bytes);
     what = "the bytes differ from " + field_at(walk, at) + " on";
   }
   std::cerr << "kvdata: warning: " << file
@@ -59,11 +68,12 @@ void check_round_trip(StreamKind kind, const Json& doc, const std::vector<Byte>&
 
 void run_decode(const DecodeOptions& o) {
   const auto [given, file] = kind_and_file(o.args);
-  const std::vector<Byte> bytes = read_bytes(file);
+  ByteArray stream = read_byte_array(file);
+  const std::span<const Byte> bytes = bytes_of(stream);
   const StreamKind kind = resolve_kind(given, bytes, file, "decode");
-  Json doc;
+  std::unique_ptr<StreamState> state;
   try {
-    doc = decode_stream(kind, bytes);
+    state = decode_stream(kind, stream);
   } catch (const InputError& e) {
     std::string message = file + ": " + e.what();
     const Walk walk = walk_layout(kind, bytes);
@@ -72,8 +82,15 @@ void run_decode(const DecodeOptions& o) {
                " shows the stream field by field.";
     bad_input(message);
   }
-  check_round_trip(kind, doc, bytes, file);
-  write_output(o.output, doc.dump(2) + "\n");
+  // The document goes out as it is written; the target is replaced only
+  // once all of it was.
+  OutputFile out(o.output);
+  JsonWriter w([&](std::string_view piece) { out.write(piece); });
+  write_document(*state, w);
+  w.flush();
+  out.write("\n");
+  check_round_trip(*state, bytes, file);
+  out.commit();
 }
 
 }  // namespace

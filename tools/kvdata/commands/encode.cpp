@@ -26,8 +26,7 @@ void run_encode(const EncodeOptions& o) {
   }
   std::vector<Byte> bytes;
   try {
-    const StreamKind kind = document_kind(doc, given);
-    bytes = encode_stream(kind, doc);
+    bytes = encode_stream(document_kind(doc, given), doc);
   } catch (const InputError& e) {
     bad_input(file + ": " + e.what());
   }

@@ -8,7 +8,7 @@
 // back unchanged.
 //
 //   Json j = single_to_json(0.1f);            // 0.1
-//   Single s = single_from_json(j, "TempCalibrated");
+//   Single s = single_from_json(j, "SCP.SCE(1)");
 
 #include <string>
 #include <string_view>

@@ -4,6 +4,7 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <cerrno>
 #include <cstdio>
 #include <cstring>
@@ -64,6 +65,31 @@ std::size_t InputFile::read(char* to, std::size_t room) {
 std::vector<Byte> read_bytes(const std::string& path) {
   const std::string text = read_all(path);
   return std::vector<Byte>(text.begin(), text.end());
+}
+
+ByteArray read_byte_array(const std::string& path) {
+  InputFile file(path);
+  std::size_t room = std::max<std::size_t>(file.size(), 1);
+  ByteArray a(0, static_cast<Long>(room) - 1);
+  std::size_t n = 0;
+  for (;;) {
+    if (n == room) {
+      // Full: the file may have grown since its size was taken.
+      char probe[1 << 12];
+      const std::size_t more = file.read(probe, sizeof probe);
+      if (more == 0) break;
+      room = std::max(2 * room, n + more);
+      a.redim_preserve(0, static_cast<Long>(room) - 1);
+      std::copy(probe, probe + more, a.data() + n);
+      n += more;
+      continue;
+    }
+    const std::size_t got = file.read(reinterpret_cast<char*>(a.data() + n), room - n);
+    if (got == 0) break;
+    n += got;
+  }
+  a.redim_preserve(0, static_cast<Long>(n) - 1);
+  return a;
 }
 
 std::string read_text(const std::string& path) {
