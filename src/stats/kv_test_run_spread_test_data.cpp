@@ -67,6 +67,49 @@ Bounds first_dimension(const Variant& v) {
   return with_array(v, [](const auto& a) { return Bounds{a.lbound(1), a.ubound(1)}; });
 }
 
+// Calls f(i, value) for i = first..last with element i of the sample in
+// `v` as a number. A one-dimensional array of numbers that holds every
+// index is resolved once and read straight through; any other sample goes
+// value by value through element(), which raises where a value is missing
+// or not a number, after f has seen the values before it.
+template <class F>
+void each_value(const Variant& v, Long first, Long last, F&& f) {
+  auto straight = [&](const auto& a) {
+    if (a.rank() != 1 || a.lbound(1) > first || a.ubound(1) < last) return false;
+    const auto* values = &a(first);
+    for (Long i = first; i <= last; ++i) f(i, as_number(values[i - first]));
+    return true;
+  };
+  if (first > last) return;
+  if (const auto* a = v.get_if<Array<Single>>(); a != nullptr && straight(*a)) return;
+  if (const auto* a = v.get_if<Array<Double>>(); a != nullptr && straight(*a)) return;
+  if (const auto* a = v.get_if<Array<Long>>(); a != nullptr && straight(*a)) return;
+  if (const auto* a = v.get_if<Array<Integer>>(); a != nullptr && straight(*a)) return;
+  if (const auto* a = v.get_if<Array<Byte>>(); a != nullptr && straight(*a)) return;
+  for (Long i = first; i <= last; ++i) f(i, element(v, i));
+}
+
+// Row `row` of a table over its second dimension, through one checked index:
+// entry i is at(i). An empty row has no entries.
+class TableRow {
+ public:
+  TableRow(Array<Single>& table, Long row)
+      : first_(table.lbound(2)),
+        last_(table.ubound(2)),
+        stride_(1 + table.ubound(1) - table.lbound(1)) {
+    if (first_ <= last_) start_ = &table(row, first_);
+  }
+  Long first() const { return first_; }
+  Long last() const { return last_; }
+  Single& at(Long i) const { return start_[static_cast<std::ptrdiff_t>(i - first_) * stride_]; }
+
+ private:
+  Long first_;
+  Long last_;
+  std::ptrdiff_t stride_;
+  Single* start_ = nullptr;
+};
+
 String decimal(Long n) {
   const std::string digits = std::to_string(n);
   return String(digits.begin(), digits.end());
@@ -138,22 +181,23 @@ Integer KVTestRunSpreadTestData::KVRR_CalculateSpreadTestData() {
   return status;
 }
 
+// Each pass resolves the table row and every sample's array once; the
+// values, their order and every rounding are those of one checked access
+// per value.
 Integer KVTestRunSpreadTestData::CalcAverageWL() {
   if (const Integer status = CheckState(); status != kSuccess) return status;
   const Collection& samples = current_samples();
   if (samples.Count() == 0) return kNoSamples;
-  const Long row = current_test_index_;
-  const Long first = average_.lbound(2);
-  const Long last = average_.ubound(2);
-  for (Long i = first; i <= last; ++i) average_(row, i) = 0.0f;
+  const TableRow average(average_, current_test_index_);
+  for (Long i = average.first(); i <= average.last(); ++i) average.at(i) = 0.0f;
   for (const Variant& sample : samples) {
-    for (Long i = first; i <= last; ++i) {
-      average_(row, i) = to_single(static_cast<Double>(average_(row, i)) + element(sample, i));
-    }
+    each_value(sample, average.first(), average.last(), [&](Long i, Double value) {
+      average.at(i) = to_single(static_cast<Double>(average.at(i)) + value);
+    });
   }
   const auto count = static_cast<Double>(samples.Count());
-  for (Long i = first; i <= last; ++i) {
-    average_(row, i) = to_single(static_cast<Double>(average_(row, i)) / count);
+  for (Long i = average.first(); i <= average.last(); ++i) {
+    average.at(i) = to_single(static_cast<Double>(average.at(i)) / count);
   }
   return kSuccess;
 }
@@ -162,15 +206,12 @@ Integer KVTestRunSpreadTestData::CalcLowestWL() {
   if (const Integer status = CheckState(); status != kSuccess) return status;
   const Collection& samples = current_samples();
   if (samples.Count() == 0) return kNoSamples;
-  const Long row = current_test_index_;
-  const Long first = lowest_.lbound(2);
-  const Long last = lowest_.ubound(2);
-  for (Long i = first; i <= last; ++i) lowest_(row, i) = kLowestStart;
+  const TableRow lowest(lowest_, current_test_index_);
+  for (Long i = lowest.first(); i <= lowest.last(); ++i) lowest.at(i) = kLowestStart;
   for (const Variant& sample : samples) {
-    for (Long i = first; i <= last; ++i) {
-      const Double value = element(sample, i);
-      if (static_cast<Double>(lowest_(row, i)) > value) lowest_(row, i) = to_single(value);
-    }
+    each_value(sample, lowest.first(), lowest.last(), [&](Long i, Double value) {
+      if (static_cast<Double>(lowest.at(i)) > value) lowest.at(i) = to_single(value);
+    });
   }
   return kSuccess;
 }
@@ -179,15 +220,12 @@ Integer KVTestRunSpreadTestData::CalcHighestWL() {
   if (const Integer status = CheckState(); status != kSuccess) return status;
   const Collection& samples = current_samples();
   if (samples.Count() == 0) return kNoSamples;
-  const Long row = current_test_index_;
-  const Long first = highest_.lbound(2);
-  const Long last = highest_.ubound(2);
-  for (Long i = first; i <= last; ++i) highest_(row, i) = kHighestStart;
+  const TableRow highest(highest_, current_test_index_);
+  for (Long i = highest.first(); i <= highest.last(); ++i) highest.at(i) = kHighestStart;
   for (const Variant& sample : samples) {
-    for (Long i = first; i <= last; ++i) {
-      const Double value = element(sample, i);
-      if (static_cast<Double>(highest_(row, i)) < value) highest_(row, i) = to_single(value);
-    }
+    each_value(sample, highest.first(), highest.last(), [&](Long i, Double value) {
+      if (static_cast<Double>(highest.at(i)) < value) highest.at(i) = to_single(value);
+    });
   }
   return kSuccess;
 }
@@ -195,11 +233,10 @@ Integer KVTestRunSpreadTestData::CalcHighestWL() {
 Integer KVTestRunSpreadTestData::CalcSpreadOfEachWL() {
   if (const Integer status = CheckState(); status != kSuccess) return status;
   const Long row = current_test_index_;
-  const Long first = spread_.lbound(2);
-  const Long last = spread_.ubound(2);
-  for (Long i = first; i <= last; ++i) spread_(row, i) = 0.0f;
-  for (Long i = first; i <= last; ++i) {
-    spread_(row, i) =
+  const TableRow spread(spread_, row);
+  for (Long i = spread.first(); i <= spread.last(); ++i) spread.at(i) = 0.0f;
+  for (Long i = spread.first(); i <= spread.last(); ++i) {
+    spread.at(i) =
         to_single(static_cast<Double>(highest_(row, i)) - static_cast<Double>(lowest_(row, i)));
   }
   return kSuccess;
