@@ -12,11 +12,13 @@
 #include <charconv>
 #include <cmath>
 #include <cstring>
+#include <future>
 #include <iostream>
 #include <iterator>
 #include <memory>
 #include <optional>
 #include <string_view>
+#include <utility>
 
 #include "commands/commands.hpp"
 #include "commands/output_format.hpp"
@@ -91,7 +93,7 @@ struct BlockResults {
   // per spectrum.
   bool deltas = false;
   std::size_t differences = 0;  // per spectrum
-  std::vector<const std::string*> reference;
+  const std::vector<const std::string*>* reference = nullptr;
   std::vector<Single> dlab;  // 3 per spectrum
   std::vector<Single> de;    // `differences` per spectrum
   std::size_t count() const { return samples->count; }
@@ -107,7 +109,7 @@ void for_each_cell(const BlockResults& r, std::size_t i, Cell number, Text text)
     number(r.chroma_hue[2 * i + 1]);
   }
   if (!r.deltas) return;
-  text(*r.reference[i]);
+  text(*(*r.reference)[i]);
   for (std::size_t j = 0; j < 3; ++j) number(r.dlab[3 * i + j]);
   for (std::size_t j = 0; j < r.differences; ++j) number(r.de[r.differences * i + j]);
 }
@@ -458,6 +460,13 @@ class CgatsWriter : public ResultWriter {
 
 // The reference spectra of --against: one for every sample, or one per
 // sample paired row by row, read block by block beside the samples.
+// The references of one block of samples.
+struct PairedReferences {
+  std::vector<const std::string*> label;  // per sample
+  std::vector<std::string> labels;        // one per sample: their own copies
+  std::vector<Single> lab;                // 3 per sample
+};
+
 class Reference {
  public:
   Reference(const std::string& path, bool extend) : stream_(path, extend) {
@@ -467,22 +476,22 @@ class Reference {
     if (single_) convert(ahead_, lab_);
   }
 
-  // The references of the next `n` samples into r: false when the reference
-  // has fewer spectra left than that.
-  bool pair(BlockResults& r, std::size_t n) {
-    r.reference.resize(n);
+  // The references of the next `n` samples into `out`: false when the
+  // reference has fewer spectra left than that.
+  bool pair(PairedReferences& out, std::size_t n) {
+    out.label.resize(n);
     if (single_) {
-      lab_of_.resize(3 * n);
+      out.lab.resize(3 * n);
       for (std::size_t i = 0; i < n; ++i) {
-        r.reference[i] = &ahead_.labels[0];
-        std::copy_n(lab_.begin(), 3, lab_of_.begin() + 3 * static_cast<std::ptrdiff_t>(i));
+        out.label[i] = &ahead_.labels[0];
+        std::copy_n(lab_.begin(), 3, out.lab.begin() + 3 * static_cast<std::ptrdiff_t>(i));
       }
       return true;
     }
     // Gather n spectra: first those read ahead, then from the stream.
     block_.count = 0;
     block_.bands.clear();
-    labels_.clear();
+    out.labels.clear();
     while (block_.count < n) {
       if (used_ == ahead_.count) {
         used_ = 0;
@@ -490,17 +499,14 @@ class Reference {
       }
       block_.bands.insert(block_.bands.end(), ahead_.bands.begin() + 40 * used_,
                           ahead_.bands.begin() + 40 * (used_ + 1));
-      labels_.push_back(ahead_.labels[used_]);
+      out.labels.push_back(ahead_.labels[used_]);
       ++used_;
       ++block_.count;
     }
-    convert(block_, lab_of_);
-    for (std::size_t i = 0; i < n; ++i) r.reference[i] = &labels_[i];
+    convert(block_, out.lab);
+    for (std::size_t i = 0; i < n; ++i) out.label[i] = &out.labels[i];
     return true;
   }
-
-  // LAB of the reference of sample i of the last pair() call.
-  const Single* lab(std::size_t i) const { return lab_of_.data() + 3 * i; }
 
   // True when spectra are left after the last pair() call.
   bool more() {
@@ -531,8 +537,6 @@ class Reference {
   bool single_ = false;
   std::vector<Single> lab_;  // the single reference's LAB
   SpectraBlock block_;
-  std::vector<std::string> labels_;
-  std::vector<Single> lab_of_;
 };
 
 [[noreturn]] void reference_count_differs(const ColourOptions& o, std::size_t references,
@@ -579,10 +583,18 @@ void differences(const ColourOptions& o, BlockResults& r, std::size_t i, const S
   std::copy_n(d, 3, &r.dlab[3 * i]);
 }
 
+// One block of samples and, with --against, their references, read while
+// the block before is computed and written.
+struct Job {
+  SpectraBlock samples;
+  PairedReferences references;
+  bool paired = false;  // false: the references ran short
+};
+
 void run_colour(const ColourOptions& o) {
   SpectraStream in(o.file, o.extend);
-  SpectraBlock block;
-  bool more = in.next(block, kBlock);  // the file's own checks come first
+  Job jobs[2];
+  bool more = in.next(jobs[0].samples, kBlock);  // the file's own checks come first
   std::optional<Reference> reference;
   if (!o.against.empty()) reference.emplace(o.against, o.extend);
 
@@ -604,31 +616,42 @@ void run_colour(const ColourOptions& o) {
     summaries.emplace(o.differences);
   }
 
+  // Reading: the samples, then their references. Once the references run
+  // short, the samples are only counted.
+  bool references_short = false;
+  auto pair = [&](Job& job) {
+    job.paired =
+        !reference || (!references_short && reference->pair(job.references, job.samples.count));
+    references_short = !job.paired;
+  };
+  auto read = [&](Job& job) {
+    if (!in.next(job.samples, kBlock)) return false;
+    pair(job);
+    return true;
+  };
+  if (more) pair(jobs[0]);
+
   auto illuminant_object = ILU_D6510::create();
   Array<Single> standard(0, 2), trial(0, 2), d;
   BlockResults r;
-  r.samples = &block;
   r.lch = o.lch;
   r.deltas = reference.has_value();
   r.differences = o.differences.size();
   std::size_t failed = 0;
-  bool references_short = false;
-  for (; more; more = in.next(block, kBlock)) {
-    if (references_short) continue;  // only counting the samples now
-    const std::size_t n = block.count;
+  auto compute = [&](const Job& job) {
+    const std::size_t n = job.samples.count;
+    r.samples = &job.samples;
     r.xyz.resize(3 * n);
     r.lab.resize(3 * n);
-    failed += calc_xyz_lab_d6510(std::span<const Single>(block.bands.data(), 40 * n), r.xyz, r.lab);
+    failed +=
+        calc_xyz_lab_d6510(std::span<const Single>(job.samples.bands.data(), 40 * n), r.xyz, r.lab);
     if (o.lch) add_chroma_and_hue(r);
     if (reference) {
-      if (!reference->pair(r, n)) {
-        references_short = true;
-        continue;
-      }
+      r.reference = &job.references.label;
       r.dlab.resize(3 * n);
       r.de.resize(r.differences * n);
       for (std::size_t i = 0; i < n; ++i) {
-        const Single* ref = reference->lab(i);
+        const Single* ref = &job.references.lab[3 * i];
         if (std::isnan(ref[0]) || std::isnan(r.lab[3 * i])) {
           const Single nan = std::nanf("");
           std::fill_n(r.dlab.begin() + 3 * i, 3, nan);
@@ -646,6 +669,18 @@ void run_colour(const ColourOptions& o) {
       if (summaries) summaries->add(r);
     }
     writer->write(r);
+  };
+
+  // The next block is read on another thread while this one is computed
+  // and written; a failure to read it surfaces after this block is out, as
+  // when the two ran one after the other.
+  Job* current = &jobs[0];
+  Job* ahead = &jobs[1];
+  while (more) {
+    std::future<bool> next = std::async(std::launch::async, read, std::ref(*ahead));
+    if (current->paired) compute(*current);
+    more = next.get();
+    std::swap(current, ahead);
   }
   if (reference && (references_short || reference->more())) {
     reference_count_differs(o, reference->total(), in.count());
