@@ -58,8 +58,10 @@ class SpreadSamples {
 
 // The status and the bits of the average, lowest, highest and spread tables
 // after calculating test `t` of a run of tests: white and blue samples, most
-// Singles, the rest of every other type; in test 3 a String sample in the
-// white tile stops the calculation with error 13 part way.
+// Singles, the rest of every other type (from test 6 on, of the numeric
+// types only); in test 3 a String sample in the white tile stops the
+// calculation with error 13 part way, in test 8 a Double beyond the Single
+// range in the blue tile with error 6.
 inline std::vector<std::uint32_t> spread_results(int t) {
   SpreadSamples rng(static_cast<std::uint64_t>(1000 + t));
   const Long points = 1 + static_cast<Long>(rng.next() * 45);
@@ -70,8 +72,15 @@ inline std::vector<std::uint32_t> spread_results(int t) {
     if (tile == 0) test->KVRR_SetCurrentTestToWhiteTile();
     if (tile == 1) test->KVRR_SetCurrentTestToBlueTile();
     for (int k = 0; k < samples; ++k) {
-      const int type = rng.next() < 0.7 ? 0 : static_cast<int>(rng.next() * 6);
+      // From test 6 on, only arrays of numbers (the calculation's one pass).
+      const int types = t >= 6 ? 5 : 6;
+      const int type = rng.next() < 0.7 ? 0 : static_cast<int>(rng.next() * types);
       test->KVRR_AddSpectralData(rng.sample(points, tile == 0 ? 90 : 30, type));
+      if (t == 8 && tile == 1 && k == samples / 3) {
+        Array<Double> huge(1, points);
+        for (Long i = 1; i <= points; ++i) huge(i) = i == points ? 1e39 : 25.0;
+        test->KVRR_AddSpectralData(Variant(huge));
+      }
       if (t == 3 && tile == 0 && k == samples / 2) {
         Array<String> text(1, points);
         for (Long i = 1; i <= points; ++i) text(i) = i == points / 2 + 1 ? u"x" : u"5";
