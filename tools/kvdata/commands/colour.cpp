@@ -557,7 +557,7 @@ void read_difference_options(ColourOptions& o) {
 }
 
 Lab lab_at(const Single* lab) {
-  return {lab[0], lab[1], lab[2]};
+  return {static_cast<double>(lab[0]), static_cast<double>(lab[1]), static_cast<double>(lab[2])};
 }
 
 // C*ab and h_ab of the block's CIELAB values.
