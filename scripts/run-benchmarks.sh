@@ -22,12 +22,19 @@ repetitions="${KVDATA_BENCH_REPETITIONS:-5}"
 filter="${KVDATA_BENCH_FILTER:-.}"          # a regular expression of benchmark names
 min_time="${KVDATA_BENCH_MIN_TIME:-0.5}"    # seconds per benchmark and repetition
 spectra="${KVDATA_BENCH_SPECTRA:-1000000}"
+peer_spectra="${KVDATA_BENCH_PEER_SPECTRA:-200000}"   # kvdata colour against spec2cie
 small_spectra=$((spectra / 10))
 results=bench/RESULTS.md
 work="$(mktemp -d)"
 trap 'rm -rf "$work"' EXIT
 
 ./scripts/install-deps.sh
+# ArgyllCMS is a peer of `kvdata colour` in this benchmark only: its spec2cie
+# runs on the same spectra. Nothing of it is linked or used elsewhere.
+if ! command -v spec2cie >/dev/null; then
+  (apt-get install -y argyll || (apt-get update && apt-get install -y argyll)) >&2 ||
+    echo "run-benchmarks: argyll could not be installed; the peer figures are left out" >&2
+fi
 cmake --preset release >/dev/null
 cmake --build --preset release -j2
 
@@ -79,13 +86,14 @@ verdict() {
 
 # --- the command end to end ---------------------------------------------------
 e2e_rows=""
+peer_rows=""
 e2e_note=""
 colour_share=""
 if [ -x "$kvdata_bin" ] && "$kvdata_bin" colour --help >/dev/null 2>&1; then
   echo "== kvdata colour end to end" >&2
-  make_csv() {  # make_csv COUNT FILE: COUNT spectra in percent, 40 bands 360..750 nm
-    awk -v n="$1" 'BEGIN {
-      srand(7); printf "SAMPLE_NAME";
+  make_csv() {  # make_csv COUNT FILE [SEED]: COUNT spectra in percent, 40 bands 360..750 nm
+    awk -v n="$1" -v seed="${3:-7}" 'BEGIN {
+      srand(seed); printf "SAMPLE_NAME";
       for (w = 360; w <= 750; w += 10) printf ",%d", w; printf "\n";
       for (i = 1; i <= n; i++) {
         printf "S%d", i; level = 5 + 90 * rand(); scale = 0.05 + 0.95 * rand();
@@ -125,6 +133,79 @@ if [ -x "$kvdata_bin" ] && "$kvdata_bin" colour --help >/dev/null 2>&1; then
     eval "rss_$n=$rss"
     eval "cpu_$n=$cpu"
   done
+  # The peer: ArgyllCMS's spec2cie on the same spectra (written as a .ti3
+  # file), the floor of reading the file (wc -l), and the command with every
+  # difference against a second file of as many references. Each figure is
+  # the median of three runs (spec2cie runs once: it takes seconds).
+  if command -v spec2cie >/dev/null; then
+    echo "== kvdata colour against spec2cie ($peer_spectra spectra)" >&2
+    peer_csv="$work/peer.csv"
+    make_csv "$peer_spectra" "$peer_csv"
+    make_csv "$peer_spectra" "$work/peer-reference.csv" 11
+    make_csv $((peer_spectra / 10)) "$work/peer-small.csv"
+    awk -f - "$peer_csv" >"$work/peer.ti3" <<'AWK'
+BEGIN { FS = "," }
+NR == 1 { bands = NF - 1; next }
+{ row[++n] = $0 }
+END {
+  print "CTI3\n"
+  print "DESCRIPTOR \"spectra of the kvdata colour benchmark\""
+  print "ORIGINATOR \"kvdata run-benchmarks.sh\""
+  print "DEVICE_CLASS \"OUTPUT\""
+  print "COLOR_REP \"RGB_XYZ\""
+  print "SPECTRAL_BANDS \"" bands "\""
+  print "SPECTRAL_START_NM \"360.000000\""
+  print "SPECTRAL_END_NM \"750.000000\""
+  print "SPECTRAL_NORM \"100.000000\"\n"
+  printf "NUMBER_OF_FIELDS %d\nBEGIN_DATA_FORMAT\nSAMPLE_ID RGB_R RGB_G RGB_B", bands + 4
+  for (w = 360; w <= 750; w += 10) printf " SPEC_%d", w
+  printf "\nEND_DATA_FORMAT\n\nNUMBER_OF_SETS %d\nBEGIN_DATA\n", n
+  for (i = 1; i <= n; i++) {
+    split(row[i], c, ","); printf "%d 0 0 0", i
+    for (b = 2; b <= bands + 1; b++) printf " %s", c[b]
+    printf "\n"
+  }
+  print "END_DATA"
+}
+AWK
+    median_of_3() {  # median_of_3 LABEL COMMAND...: the run with the median wall time
+      for k in 1 2 3; do timed "$1" "${@:2}"; done | sort -n | sed -n 2p
+    }
+    peer_row() {  # peer_row TEXT FIGURES: one table row
+      local wall cpu rss
+      IFS=$'\t' read -r wall cpu rss <<<"$2"
+      peer_rows+="| $1 | $wall s | $cpu s | $((rss / 1024)) MB |"$'\n'
+    }
+    wc_figures=$(median_of_3 wc wc -l "$peer_csv")
+    colour_figures=$(median_of_3 colour "$kvdata_bin" colour "$peer_csv" --format csv -o "$work/peer-out.csv")
+    small_figures=$(median_of_3 colour_small "$kvdata_bin" colour "$work/peer-small.csv" --format csv \
+      -o "$work/peer-small-out.csv")
+    against_figures=$(median_of_3 against "$kvdata_bin" colour "$peer_csv" --against \
+      "$work/peer-reference.csv" --de ab,94,cmc,2000 --format csv -o "$work/peer-against.csv")
+    spec2cie_figures=$(timed spec2cie spec2cie -i D65 -o 1964_10 -n "$work/peer.ti3" "$work/peer-out.ti3")
+    peer_row "\`wc -l FILE.csv\` (the floor: reading the file)" "$wc_figures"
+    peer_row "\`kvdata colour FILE.csv --format csv -o OUT\`" "$colour_figures"
+    peer_row "the same on a tenth of the spectra" "$small_figures"
+    peer_row "\`kvdata colour FILE.csv --against REF.csv --de ab,94,cmc,2000 --format csv -o OUT\`" "$against_figures"
+    peer_row "\`spec2cie -i D65 -o 1964_10 -n FILE.ti3 OUT.ti3\`" "$spec2cie_figures"
+    wall_of() { cut -f1 <<<"$1"; }
+    peer_ratio() {  # peer_ratio A B: wall of A over wall of B
+      awk -v a="$(wall_of "$1")" -v b="$(wall_of "$2")" \
+        'BEGIN { if (b > 0) printf "%.1f", a / b; else print "n/a" }'
+    }
+    cpu_of() { cut -f2 <<<"$1"; }
+    peer_cpu_ratio() {  # peer_cpu_ratio A B: CPU time of A over CPU time of B
+      awk -v a="$(cpu_of "$1")" -v b="$(cpu_of "$2")" \
+        'BEGIN { if (b > 0) printf "%.1f", a / b; else print "n/a" }'
+    }
+    peer_cpu_speedup=$(peer_cpu_ratio "$spec2cie_figures" "$colour_figures")
+    peer_cpu_against=$(peer_cpu_ratio "$spec2cie_figures" "$against_figures")
+    peer_speedup=$(peer_ratio "$spec2cie_figures" "$colour_figures")
+    peer_against_speedup=$(peer_ratio "$spec2cie_figures" "$against_figures")
+    peer_floor=$(peer_ratio "$colour_figures" "$wc_figures")
+    peer_rss_growth=$(awk -v a="$(cut -f3 <<<"$small_figures")" -v b="$(cut -f3 <<<"$colour_figures")" \
+      'BEGIN { printf "%.1f", (a > 0) ? b / a : 0 }')
+  fi
   rss_small=$(eval echo "\$rss_$small_spectra")
   rss_large=$(eval echo "\$rss_$spectra")
   cpu_large=$(eval echo "\$cpu_$spectra")
@@ -323,6 +404,30 @@ host_wall_ratio="$(jq -r 'map(.real_time / .cpu_time) | add / length' "$work/med
       echo "- The colour work (the batch rate above applied to $spectra spectra) is $colour_share % of"
       echo "  the command's CPU time; the rest is reading, parsing and writing."
     fi
+  fi
+  if [ -n "$peer_rows" ]; then
+    echo
+    echo "### Against ArgyllCMS's spec2cie and the floor of reading the file"
+    echo
+    echo "$peer_spectra spectra in the CSV above and as a .ti3 file (the same numbers), D65 and the"
+    echo "10-degree observer; REF.csv holds as many other spectra, one reference per sample. One"
+    echo "process each, measured by GNU time, median wall time of three runs (spec2cie: one run)."
+    echo "\`kvdata\` reads, computes and formats on both cores."
+    echo
+    echo "| command | wall | CPU (user + sys) | peak memory |"
+    echo "|---|---|---|---|"
+    printf '%s' "$peer_rows"
+    echo
+    echo "- spec2cie / \`kvdata colour\`, wall: $peer_speedup times (target >= 100; $(verdict "$peer_speedup" 100 ge))."
+    echo "- spec2cie / \`kvdata colour --against\` with all four differences, wall: $peer_against_speedup times"
+    echo "  (target >= 50; $(verdict "$peer_against_speedup" 50 ge))."
+    echo "- In CPU time (user + sys) spec2cie takes $peer_cpu_speedup times \`kvdata colour\` and"
+    echo "  $peer_cpu_against times \`kvdata colour --against\`: on a loaded machine (see the load"
+    echo "  average above) the short two-thread process waits for the cores longer than the"
+    echo "  long single-thread one, so its wall time grows more."
+    echo "- \`kvdata colour\` / \`wc -l\`, wall: $peer_floor times (the floor of reading the file)."
+    echo "- Peak memory at $peer_spectra spectra is $peer_rss_growth times that at a tenth of them (target:"
+    echo "  it does not grow with the file; $(verdict "$peer_rss_growth" 1.5))."
   fi
   if [ -n "$stream_rows" ]; then
     echo

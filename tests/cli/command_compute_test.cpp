@@ -82,10 +82,44 @@ TEST(CommandCompute, ColourAgainstAReferenceGivesTheDifferencesOfEachSample) {
   ASSERT_EQ(doc["samples"].size(), 13u);
   for (const Json& s : doc["samples"]) {
     EXPECT_EQ(s["sample"], s["reference"]);  // paired row by row
-    const double dL = s["dLAB"][0], da = s["dLAB"][1], db = s["dLAB"][2], dE = s["dE"];
+    const double dL = s["dLAB"][0], da = s["dLAB"][1], db = s["dLAB"][2], dE = s["dE*ab"];
     EXPECT_NEAR(dE, std::sqrt(dL * dL + da * da + db * db), 1e-4);
     EXPECT_LT(dE, 1.0);
   }
+  // The summary of each difference: the largest and the mean of the samples'
+  // own figures; --summary-only writes the same summary and no samples.
+  const auto both =
+      kvdata({"colour", example("spectra/tiles.csv"), "--against",
+              example("spectra/tiles-certified.cgats"), "--de", "2000,ab", "--format", "json"});
+  ASSERT_EQ(both.code, 0) << both.err;
+  const Json full = Json::parse(both.out);
+  ASSERT_EQ(full["summary"].size(), 2u);
+  EXPECT_EQ(full["summary"].begin().key(), "dE00");
+  for (const char* column : {"dE00", "dE*ab"}) {
+    const Json& summary = full["summary"][column];
+    double largest = -1, sum = 0;
+    std::string at;
+    for (const Json& s : full["samples"]) {
+      sum += s[column].get<double>();
+      if (s[column].get<double>() > largest) largest = s[column], at = s["sample"];
+    }
+    EXPECT_EQ(summary["count"], 13) << column;
+    EXPECT_EQ(summary["max"].get<double>(), largest) << column;
+    EXPECT_EQ(summary["max_sample"], at) << column;
+    EXPECT_NEAR(summary["mean"].get<double>(), sum / 13, 1e-6) << column;
+    EXPECT_LE(summary["median"].get<double>(), summary["p95"].get<double>()) << column;
+  }
+  const auto only = kvdata({"colour", example("spectra/tiles.csv"), "--against",
+                            example("spectra/tiles-certified.cgats"), "--de", "2000,ab", "--format",
+                            "json", "--summary-only"});
+  ASSERT_EQ(only.code, 0) << only.err;
+  EXPECT_FALSE(Json::parse(only.out).contains("samples"));
+  EXPECT_EQ(Json::parse(only.out)["summary"], full["summary"]);
+  EXPECT_EQ(kvdata({"colour", example("spectra/tiles.csv"), "--summary-only"}).code, 2);
+  EXPECT_EQ(kvdata({"colour", example("spectra/tiles.csv"), "--against",
+                    example("spectra/tiles.csv"), "--de", "ab,76"})
+                .code,
+            2);
   // The white tile measured: a light, nearly neutral colour.
   EXPECT_GT(doc["samples"][0]["LAB"][0].get<double>(), 95.0);
   EXPECT_LT(std::fabs(doc["samples"][0]["LAB"][1].get<double>()), 1.0);

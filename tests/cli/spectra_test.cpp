@@ -1,6 +1,10 @@
 // Reading measurement files and mapping them onto the 40 bands.
 #include <gtest/gtest.h>
 
+#include <bit>
+#include <charconv>
+#include <cmath>
+#include <cstdint>
 #include <filesystem>
 #include <fstream>
 
@@ -68,6 +72,66 @@ TEST(Spectra, CsvRowsQuotingAndSeparators) {
   std::string semicolons = header(360, 750, 10) + "\n" + row("A", 360, 750, 10) + "\n";
   for (char& c : semicolons) c = c == ',' ? ';' : c;
   EXPECT_EQ(read_csv("s.csv", semicolons).rows.size(), 1u);
+}
+
+// Every form of cell, read through each of the reader's paths (short cells
+// eight bytes at a time, longer plain decimals, everything else), gives the
+// double std::from_chars gives, or is refused; quoted cells go the general way.
+TEST(Spectra, CsvCellsReadAsFromCharsReadsThem) {
+  const char* cells[] = {"12.345",
+                         "-12.345",
+                         "0",
+                         "-0",
+                         ".5",
+                         "12.",
+                         "-.5",
+                         "5",
+                         "12345678",
+                         "1234567.8",
+                         "123456789",
+                         "99999999.5",
+                         "0.0000001",
+                         "-9.9999999",
+                         "00000001",
+                         "1.2.3",
+                         ".",
+                         "-",
+                         "--1",
+                         "+1.5",
+                         " 7.25 ",
+                         "1e-05",
+                         "-2.5E+3",
+                         "1 2",
+                         "12a",
+                         "0x10",
+                         "inf",
+                         "nan",
+                         "1234567890123456789.5"};
+  for (const char* cell : cells) {
+    for (const bool quoted : {false, true}) {
+      const std::string text = cell;
+      std::string body = header(360, 750, 10) + "\nA";
+      for (int b = 0; b < 40; ++b) body += "," + (quoted ? "\"" + text + "\"" : text);
+      double expected = 0;
+      std::string_view t = text;
+      while (!t.empty() && t.front() == ' ') t.remove_prefix(1);
+      while (!t.empty() && t.back() == ' ') t.remove_suffix(1);
+      if (!t.empty() && t.front() == '+') t.remove_prefix(1);
+      const auto r = std::from_chars(t.data(), t.data() + t.size(), expected);
+      const bool good =
+          r.ec == std::errc{} && r.ptr == t.data() + t.size() && std::isfinite(expected);
+      if (!good) {
+        EXPECT_NE(error_of([&] { read_csv("t.csv", body); }).find("not a number"),
+                  std::string::npos)
+            << cell;
+        continue;
+      }
+      const SpectraTable table = read_csv("t.csv", body);
+      for (const double v : table.rows.at(0).values) {
+        EXPECT_EQ(std::bit_cast<std::uint64_t>(v), std::bit_cast<std::uint64_t>(expected)) << cell;
+      }
+    }
+  }
 }
 
 TEST(Spectra, CsvErrorsNameTheLineAndColumn) {

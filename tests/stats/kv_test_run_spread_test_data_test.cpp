@@ -4,13 +4,17 @@
 
 #include <bit>
 #include <cstdint>
+#include <fstream>
 #include <initializer_list>
 #include <memory>
+#include <sstream>
+#include <string>
 #include <vector>
 
 #include "kvdata/automation/create_object.hpp"
 #include "kvdata/automation/error.hpp"
 #include "kvdata/objects/kv_tol_set.hpp"
+#include "spread_samples.hpp"
 #include "support/error_number.hpp"
 
 namespace kvdata {
@@ -334,6 +338,29 @@ TEST(KVTestRunSpreadTestData, KeepsTheCallersToleranceSetUntilReleased) {
   EXPECT_EQ(set.use_count(), 2);
   rr->KVRR_ReleaseSpreadTestData();
   EXPECT_EQ(set.use_count(), 1);
+}
+
+}  // namespace
+}  // namespace kvdata
+
+namespace kvdata {
+namespace {
+
+// Pseudo-random tests of every sample type, one stopped part way, give the
+// tables bit for bit as recorded when each value went through its Variant.
+TEST(KVTestRunSpreadTestData, RandomTestsGiveTheRecordedTablesToTheBit) {
+  std::ifstream in(std::string(KVDATA_SOURCE_DIR) + "/tests/data/spread-results.txt");
+  int t = 0;
+  for (std::string line; std::getline(in, line);) {
+    if (line.starts_with('#')) continue;
+    std::vector<std::uint32_t> recorded;
+    std::istringstream words(line);
+    for (std::string word; words >> word;)
+      recorded.push_back(static_cast<std::uint32_t>(std::stoul(word, nullptr, 16)));
+    EXPECT_EQ(testing::spread_results(t), recorded) << "test " << t;
+    ++t;
+  }
+  EXPECT_EQ(t, 9);
 }
 
 }  // namespace

@@ -52,6 +52,7 @@ class CsvSpectraReader {
   std::vector<double> wavelengths_;
   std::optional<std::size_t> name_column_;
   std::string_view name_;
+  std::vector<double> denominators_;  // of the row being read
 };
 
 // The whole file as a table. InputError names the file, the line and the

@@ -10,7 +10,7 @@ namespace kvdata::cli {
 CsvRecords::CsvRecords(std::string path, Source source, std::size_t block_bytes)
     : path_(std::move(path)),
       source_(std::move(source)),
-      buffer_(std::max<std::size_t>(block_bytes, 1)) {
+      buffer_(std::max<std::size_t>(block_bytes, 1) + kReadAhead) {
   // The separator comes from the first line, up to its LF (or the whole text).
   const char* newline = nullptr;
   while (newline == nullptr) {
@@ -54,8 +54,10 @@ bool CsvRecords::more() {
     end_ -= begin_;
     begin_ = 0;
   }
-  if (end_ == buffer_.size()) buffer_.resize(2 * buffer_.size());
-  const std::size_t n = source_(buffer_.data() + end_, buffer_.size() - end_);
+  // The last kReadAhead bytes are never filled: cells may be read past their end.
+  const std::size_t room = buffer_.size() - kReadAhead;
+  if (end_ == room) buffer_.resize(2 * room + kReadAhead);
+  const std::size_t n = source_(buffer_.data() + end_, buffer_.size() - kReadAhead - end_);
   if (n == 0) {
     at_end_ = true;
   }
@@ -86,6 +88,7 @@ CsvRecords::Step CsvRecords::parse_plain() {
     if (p == e) {
       if (!at_end_) return Step::NeedMore;
       cells_.emplace_back(cell, static_cast<std::size_t>(p - cell));
+      in_block_ = true;
       finish(end_, line_);
       return Step::Record;
     }
@@ -98,6 +101,7 @@ CsvRecords::Step CsvRecords::parse_plain() {
       if (p + 1 == e && !at_end_) return Step::NeedMore;
       if (p + 1 < e && p[1] == '\n') ++p;
     }
+    in_block_ = true;
     finish(static_cast<std::size_t>(p + 1 - base), line_ + 1);
     return Step::Record;
   }
@@ -114,6 +118,7 @@ CsvRecords::Step CsvRecords::parse_quoted() {
   std::size_t line = line_;
   const char sep = separator_;
   auto done = [&](const char* next) {
+    in_block_ = false;
     owned_.push_back(std::move(cell));
     cells_.assign(owned_.begin(), owned_.end());
     finish(static_cast<std::size_t>(next - base), line);

@@ -39,6 +39,11 @@ class CsvRecords {
   bool next();
   // The current record's cells, valid until the next call to next().
   std::span<const std::string_view> cells() const { return cells_; }
+  // True when the current record's cells are views into the block read: then
+  // kReadAhead bytes after the end of each cell may be read (their values
+  // are whatever follows in the block, or unspecified).
+  bool cells_in_block() const { return in_block_; }
+  static constexpr std::size_t kReadAhead = 8;
   // The line on which the current record starts (1-based).
   std::size_t line() const { return record_line_; }
   // Bytes taken from the source so far.
@@ -67,6 +72,7 @@ class CsvRecords {
   std::array<bool, 256> ends_cell_{};  // the separator, CR and LF
   std::vector<std::string_view> cells_;
   std::vector<std::string> owned_;  // cells of a record with quoted cells
+  bool in_block_ = false;
 };
 
 }  // namespace kvdata::cli
