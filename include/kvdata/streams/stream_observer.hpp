@@ -61,12 +61,13 @@ class StreamObserver {
   virtual void leave() {}
   // A field was read, or a fixed-width text is about to be written.
   virtual void field(const StreamField& /*f*/) {}
-  // The reader stops at `position`, at the field `name` (a field of the
-  // record entered last, or a description such as "tile count"), having
-  // expected what `expected` says in plain words ("a tile count from 1 to
-  // 254; found 300").
+  // The reader stops at `position`, at the field `name` (element `index` of
+  // it, for a fixed array; a field of the record entered last, or a
+  // description such as "tile count"), having expected what `expected` says
+  // in plain words ("a tile count from 1 to 254; found 300"). A reader
+  // refuses at most once, and reads nothing after it.
   virtual void refused(Long /*position*/, std::string_view /*name*/,
-                       std::string_view /*expected*/) {}
+                       std::optional<Long> /*index*/, std::string_view /*expected*/) {}
 };
 
 // Installs `observer` for the readers and writers called on this thread
@@ -84,5 +85,20 @@ class ObservedStreams {
 
 // The observer installed on this thread, or nullptr.
 StreamObserver* stream_observer() noexcept;
+
+// Names of the bytes that hold no field of a record, as readers report them
+// (and as a program that shows a stream names what follows the encoding).
+namespace stream_names {
+inline constexpr std::string_view kStreamVersion = "stream version";  // a stamp a reader checks
+inline constexpr std::string_view kAlignmentGap = "alignment gap";    // written as 0, not read
+inline constexpr std::string_view kTrailingByte = "trailing byte";    // written as 0, dropped
+inline constexpr std::string_view kZeroBytes = "zero bytes";          // written as 0, not read
+inline constexpr std::string_view kTileCount = "tile count";
+inline constexpr std::string_view kMemberCount = "member count";
+inline constexpr std::string_view kRecordName = "record name";  // the type name of a Variant record
+// After the encoding: the byte an object's writer leaves, and anything more.
+inline constexpr std::string_view kSpareByte = "spare byte";
+inline constexpr std::string_view kEndOfStream = "end of stream";
+}  // namespace stream_names
 
 }  // namespace kvdata

@@ -6,8 +6,7 @@
 #include "support/errors.hpp"
 #include "support/files.hpp"
 #include "wire/codec.hpp"
-#include "wire/explain_render.hpp"
-#include "wire/layouts.hpp"
+#include "wire/stream_walk.hpp"
 
 namespace kvdata::cli {
 namespace {
@@ -16,17 +15,6 @@ struct DecodeOptions {
   std::vector<std::string> args;
   std::string output;
 };
-
-// The field of the walk that holds byte `offset`, for messages.
-std::string field_at(const Walk& walk, std::size_t offset) {
-  for (const FieldRow& r : walk.rows) {
-    if (offset >= r.offset && offset < r.offset + r.width) {
-      return r.name + " (offset " + std::to_string(r.offset) + ", " + std::to_string(r.width) +
-             " bytes)";
-    }
-  }
-  return "offset " + std::to_string(offset);
-}
 
 // Warns when encoding the decoded document does not give the same bytes.
 void check_round_trip(StreamKind kind, const Json& doc, const std::vector<Byte>& bytes,
@@ -42,7 +30,6 @@ void check_round_trip(StreamKind kind, const Json& doc, const std::vector<Byte>&
   if (again == bytes) return;
   std::size_t at = 0;
   while (at < again.size() && at < bytes.size() && again[at] == bytes[at]) ++at;
-  const Walk walk = walk_layout(kind, bytes);
   std::string what;
   if (at == bytes.size()) {
     what = "encoding adds " + std::to_string(again.size() - bytes.size()) + " bytes at the end";
@@ -50,7 +37,7 @@ void check_round_trip(StreamKind kind, const Json& doc, const std::vector<Byte>&
     what = "the last " + std::to_string(bytes.size() - again.size()) +
            " bytes are not part of the decoded stream";
   } else {
-    what = "the bytes differ from " + field_at(walk, at) + " on";
+    what = "the bytes differ from " + field_at(kind, bytes, at) + " on";
   }
   std::cerr << "kvdata: warning: " << file
             << ": encoding this JSON will not give back the same bytes: " << what
@@ -66,8 +53,7 @@ void run_decode(const DecodeOptions& o) {
     doc = decode_stream(kind, bytes);
   } catch (const InputError& e) {
     std::string message = file + ": " + e.what();
-    const Walk walk = walk_layout(kind, bytes);
-    if (walk.problem) message += ".\n" + verdict(walk, bytes.size());
+    if (const auto problem = stream_problem(kind, bytes)) message += ".\n" + *problem;
     message += "\nkvdata explain " + std::string(kind_name(kind)) + " " + file +
                " shows the stream field by field.";
     bad_input(message);

@@ -8,6 +8,7 @@
 #include <cstdio>
 #include <cstring>
 #include <iostream>
+#include <limits>
 
 #include "support/errors.hpp"
 #include "support/output_file.hpp"
@@ -64,6 +65,26 @@ std::size_t InputFile::read(char* to, std::size_t room) {
 std::vector<Byte> read_bytes(const std::string& path) {
   const std::string text = read_all(path);
   return std::vector<Byte>(text.begin(), text.end());
+}
+
+ByteArray read_byte_array(const std::string& path) {
+  InputFile file(path);
+  ByteArray bytes(0, -1);
+  // One more than the file's size, so that the read that finds the end
+  // needs no growth.
+  bytes.reserve(file.size() + 1);
+  char buf[1 << 16];
+  for (;;) {
+    const std::size_t n = file.read(buf, sizeof buf);
+    if (n == 0) break;
+    const Long at = bytes.ubound() + 1;
+    if (n > static_cast<std::size_t>(std::numeric_limits<Long>::max() - at)) {
+      bad_input(path + ": is too large for a stream");
+    }
+    bytes.redim_preserve(0, at + static_cast<Long>(n) - 1);
+    std::memcpy(bytes.data() + at, buf, n);
+  }
+  return bytes;
 }
 
 std::string read_text(const std::string& path) {
