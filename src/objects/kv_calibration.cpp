@@ -3,21 +3,21 @@
 #include <algorithm>
 #include <cassert>
 #include <cstddef>
-#include <string_view>
 #include <new>
+#include <string_view>
 
 #include "kvdata/automation/error.hpp"
 #include "kvdata/automation/text.hpp"
-#include "kvdata/objects/kv_cal_tile.hpp"
 #include "kvdata/foundation/record_fields.hpp"
+#include "kvdata/objects/kv_cal_tile.hpp"
 #include "kvdata/streams/stream_observer.hpp"
 #include "objects/detail/object_stream.hpp"
 #include "objects/detail/property_names.hpp"
 #include "objects/detail/record_image.hpp"
 #include "streams/detail/block_layout.hpp"
-#include "streams/detail/observe.hpp"
 #include "streams/detail/fixed_text.hpp"
 #include "streams/detail/little_endian.hpp"
+#include "streams/detail/observe.hpp"
 
 namespace kvdata {
 namespace {
@@ -40,7 +40,8 @@ constexpr auto kSlot = detail::block_layout<2>({
     detail::singles_cell(*member_name(eSC::SCI), kBandCount),
 });
 constexpr const detail::Cell& kTSN = kHeader.at(field_name<&tTileSetCalibration::TSN>());
-constexpr const detail::Cell& kCertified = kHeader.at(field_name<&tTileSetCalibration::Certified>());
+constexpr const detail::Cell& kCertified =
+    kHeader.at(field_name<&tTileSetCalibration::Certified>());
 constexpr const detail::Cell& kTempCalibrated =
     kHeader.at(field_name<&tTileSetCalibration::TempCalibrated>());
 constexpr Integer kTileCount = 13;
@@ -63,9 +64,9 @@ static_assert(slot_offset(13) + kSlot.cells[1].offset + 39 * 4 == 4184);
 void store_slot(std::span<Byte> block, Long idx, const tSCPair& pair) {
   const std::span<Byte> slot = block.subspan(slot_offset(idx), kSlot.bytes);
   for (Long sc = 0; sc <= 1; ++sc) {
-    [[maybe_unused]] const bool inside = detail::store_le_run(
-        slot, kSlot.cells[static_cast<std::size_t>(sc)].offset,
-        std::span<const Single>(pair.Spectrum(sc).Data));
+    [[maybe_unused]] const bool inside =
+        detail::store_le_run(slot, kSlot.cells[static_cast<std::size_t>(sc)].offset,
+                             std::span<const Single>(pair.Spectrum(sc).Data));
     assert(inside);
   }
 }
@@ -74,9 +75,9 @@ tSCPair load_slot(std::span<const Byte> block, Long idx) {
   const std::span<const Byte> slot = block.subspan(slot_offset(idx), kSlot.bytes);
   tSCPair pair;
   for (Long sc = 0; sc <= 1; ++sc) {
-    [[maybe_unused]] const bool inside = detail::load_le_run(
-        slot, kSlot.cells[static_cast<std::size_t>(sc)].offset,
-        std::span<Single>(pair.Spectrum(sc).Data));
+    [[maybe_unused]] const bool inside =
+        detail::load_le_run(slot, kSlot.cells[static_cast<std::size_t>(sc)].offset,
+                            std::span<Single>(pair.Spectrum(sc).Data));
     assert(inside);
   }
   return pair;
@@ -92,7 +93,8 @@ void observe_calibration(StreamObserver& observer, std::span<const Byte> present
     const detail::ObservedRecord tile(&observer, kTiles, idx);
     const std::span<const Byte> slot =
         present.size() > offset ? present.subspan(offset) : std::span<const Byte>();
-    if (!detail::observe_block(observer, kSlot.cells, slot.first(std::min(slot.size(), kSlot.bytes)),
+    if (!detail::observe_block(observer, kSlot.cells,
+                               slot.first(std::min(slot.size(), kSlot.bytes)),
                                position + static_cast<Long>(offset))) {
       return;
     }

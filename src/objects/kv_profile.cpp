@@ -155,7 +155,8 @@ bool KVProfile::IKVStream_StreamIn(const ByteArray& bytStream, Long& Position) {
   tables_ = *tables;
 
   detail::FieldReader tail(bytStream, Position);
-  const detail::ObservedRecord band_width(observer, property_name<KVProfile>("BandWidthCorrection"));
+  const detail::ObservedRecord band_width(observer,
+                                          property_name<KVProfile>("BandWidthCorrection"));
   for (const eSC sc : {eSC::SCE, eSC::SCI}) {
     tail.get_spectrum(band_width_(sc), detail::FieldReader::sc_name(sc));
   }

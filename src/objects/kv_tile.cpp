@@ -3,8 +3,8 @@
 #include <new>
 
 #include "kvdata/automation/error.hpp"
-#include "objects/detail/narrow_single.hpp"
 #include "kvdata/streams/stream_observer.hpp"
+#include "objects/detail/narrow_single.hpp"
 #include "objects/detail/object_stream.hpp"
 #include "objects/detail/property_names.hpp"
 #include "objects/detail/record_image.hpp"
@@ -82,7 +82,8 @@ bool KVTile::IKVStream_StreamIn(const ByteArray& bytStream, Long& Position) {
   if (StreamObserver* const observer = stream_observer()) {
     const detail::ObservedRecord property(observer, detail::property_name<KVTile>("v1Tile"));
     const auto taken = static_cast<std::size_t>(static_cast<long long>(Position) - start);
-    static_cast<void>(detail::observe_tile(*observer, std::span<const Byte>(scratch).first(taken), start));
+    static_cast<void>(
+        detail::observe_tile(*observer, std::span<const Byte>(scratch).first(taken), start));
   }
   if (!whole) return false;
   block_ = scratch;

@@ -2,8 +2,8 @@
 
 #include <algorithm>
 #include <array>
-#include <charconv>
 #include <cassert>
+#include <charconv>
 #include <new>
 #include <span>
 #include <string>
@@ -106,12 +106,11 @@ void refuse_short(StreamObserver& observer, const ByteArray& stream, Long positi
   for (const detail::Cell& cell : kBlock.cells) {
     if (in_block < cell.offset + cell.bytes()) {
       const detail::ObservedRecord property(&observer, kProperty);
-      detail::refuse(&observer, position + static_cast<Long>(kStampBytes + cell.offset),
-                     cell.name, [&] {
-                       return detail::cell_words(cell) + ": " +
-                              detail::shortfall(cell.bytes(), in_block - cell.offset) +
-                              nothing_taken;
-                     });
+      detail::refuse(
+          &observer, position + static_cast<Long>(kStampBytes + cell.offset), cell.name, [&] {
+            return detail::cell_words(cell) + ": " +
+                   detail::shortfall(cell.bytes(), in_block - cell.offset) + nothing_taken;
+          });
       return;
     }
   }
@@ -177,7 +176,8 @@ bool KVUser::IKVStream_StreamIn(const ByteArray& bytStream, Long& Position) {
     if (stamp != kStamp) {
       detail::refuse(observer, stamp_at, stream_names::kStreamVersion, [&] {
         return "the user stream version stamp " + single_text(kStamp) + "; found " +
-               single_text(stamp) + ", the stamp of another library version or not a stream of "
+               single_text(stamp) +
+               ", the stamp of another library version or not a stream of "
                "this kind";
       });
       raise(kVersionMismatch, kSourceIn, u"Client and Server KVData.DLL versions don't match");

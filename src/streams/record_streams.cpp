@@ -88,9 +88,8 @@ bool read_tile_set_calibration(const ByteArray& stream, Long& position, tTileSet
     if (needed > bytes_from(stream, position)) {
       refuse(observer, count_at, stream_names::kTileCount, [&] {
         return "a tile count that fits: it says " + std::to_string(count) +
-               " tiles, which need at least " + std::to_string(needed) +
-               " more bytes, but only " + std::to_string(bytes_from(stream, position)) +
-               " are left";
+               " tiles, which need at least " + std::to_string(needed) + " more bytes, but only " +
+               std::to_string(bytes_from(stream, position)) + " are left";
       });
       return false;
     }
@@ -144,9 +143,8 @@ bool read_profile(const ByteArray& stream, Long& position, tOVProfile& profile) 
   FieldReader in(stream, position);
   StreamObserver* const observer = in.observer();
   const ObservedRecord pro(observer, kProfileArgument);
-  in.get<&tOVProfile::ISN>(profile)
-      .get<&tOVProfile::Created>(profile)
-      .get<&tOVProfile::Validated>(profile);
+  in.get<&tOVProfile::ISN>(profile).get<&tOVProfile::Created>(profile).get<&tOVProfile::Validated>(
+      profile);
   String type_name;
   const Long name_at = in.position();
   in.get_string(type_name, stream_names::kRecordName);

@@ -153,8 +153,7 @@ bool read_test_run(const ByteArray& stream, Long& position, tTestRun1& run) {
   tTUD_IIA& iia = fresh.IIA;
   const ObservedRecord iia_record(observer, field_name<&tTestRun1::IIA>());
   get_stats(in, field_name<&tTUD_IIA::Stats>(), iia.Stats);
-  in.get<&tTUD_IIA::CalStandard>(iia).get<&tTUD_IIA::TSN>(iia).get<&tTUD_IIA::Has2Measurement>(
-      iia);
+  in.get<&tTUD_IIA::CalStandard>(iia).get<&tTUD_IIA::TSN>(iia).get<&tTUD_IIA::Has2Measurement>(iia);
 
   for (Long m = 1; m <= series_count(iia) && in.ok(); ++m) {
     tIIATileSet& series = iia.Measurements(m);

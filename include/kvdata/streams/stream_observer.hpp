@@ -66,8 +66,8 @@ class StreamObserver {
   // description such as "tile count"), having expected what `expected` says
   // in plain words ("a tile count from 1 to 254; found 300"). A reader
   // refuses at most once, and reads nothing after it.
-  virtual void refused(Long /*position*/, std::string_view /*name*/,
-                       std::optional<Long> /*index*/, std::string_view /*expected*/) {}
+  virtual void refused(Long /*position*/, std::string_view /*name*/, std::optional<Long> /*index*/,
+                       std::string_view /*expected*/) {}
 };
 
 // Installs `observer` for the readers and writers called on this thread

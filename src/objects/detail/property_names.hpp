@@ -2,7 +2,8 @@
 // The name of an object's property as its description spells it, checked at
 // compile time: a name the object does not stream does not compile.
 //
-//   constexpr std::string_view kName = kvdata::detail::property_name<kvdata::KVTolerance>("TolName");
+//   constexpr std::string_view kName =
+//   kvdata::detail::property_name<kvdata::KVTolerance>("TolName");
 
 #include <string_view>
 

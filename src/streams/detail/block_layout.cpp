@@ -7,9 +7,7 @@
 #include "streams/detail/observe.hpp"
 
 namespace kvdata::detail {
-namespace {
-
-}  // namespace
+namespace {}  // namespace
 
 std::string cell_words(const Cell& cell) {
   switch (cell.kind) {
@@ -87,8 +85,8 @@ bool observe_block(StreamObserver& observer, std::span<const Cell> cells,
       case CellKind::Text: {
         String text;
         static_cast<void>(load_fixed_text(present, cell.offset, cell.count, text));
-        report(&observer, cell.name, at, static_cast<Long>(cell.bytes()),
-               std::u16string_view(text), std::nullopt, cell.count);
+        report(&observer, cell.name, at, static_cast<Long>(cell.bytes()), std::u16string_view(text),
+               std::nullopt, cell.count);
         break;
       }
       case CellKind::Gap:

@@ -131,9 +131,8 @@ constexpr const Cell* find_cell(std::span<const Cell> cells, std::string_view na
 // With an observer, each text is reported first, as given, at stream index
 // `position` plus its offset. False when a cell does not lie inside `image`.
 template <DescribedRecord R>
-[[nodiscard]] bool store_fields(const R& record, std::span<const Cell> cells,
-                                std::span<Byte> image, StreamObserver* observer = nullptr,
-                                Long position = 0) {
+[[nodiscard]] bool store_fields(const R& record, std::span<const Cell> cells, std::span<Byte> image,
+                                StreamObserver* observer = nullptr, Long position = 0) {
   bool ok = true;
   for_each_field(record, [&](const auto& d, const auto& value) {
     const Cell* cell = find_cell(cells, d.name);
@@ -156,8 +155,8 @@ template <DescribedRecord R>
 // `raw_text`, which keeps its units as stored. False when a cell does not
 // lie inside `image`.
 template <DescribedRecord R>
-[[nodiscard]] bool load_fields(std::span<const Byte> image, std::span<const Cell> cells,
-                               R& record, std::string_view raw_text = {}) {
+[[nodiscard]] bool load_fields(std::span<const Byte> image, std::span<const Cell> cells, R& record,
+                               std::string_view raw_text = {}) {
   bool ok = true;
   for_each_field(record, [&](const auto& d, auto& value) {
     const Cell* cell = find_cell(cells, d.name);

@@ -29,7 +29,8 @@ StreamKind resolve_kind(std::optional<StreamKind> kind, std::span<const Byte> by
 
 StreamKind resolve_kind(std::optional<StreamKind> kind, const ByteArray& bytes,
                         const std::string& file, const std::string& command) {
-  if (!bytes.has_bounds() || bytes.size() == 0) bad_input(file + ": is empty; there is no stream to read");
+  if (!bytes.has_bounds() || bytes.size() == 0)
+    bad_input(file + ": is empty; there is no stream to read");
   if (kind) return *kind;
   const Identification id = identify(bytes);
   if (!id.kind) {

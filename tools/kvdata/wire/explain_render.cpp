@@ -176,32 +176,32 @@ std::string hex_bytes(std::span<const Byte> bytes, std::size_t limit) {
 }
 
 std::string value_text(const StreamField& f, std::span<const Byte> stream) {
-  return std::visit(
-      Overloaded{
-          [&](std::monostate) { return show_filler(f.name); },
-          [](Byte v) { return std::to_string(v); },
-          [](Integer v) { return std::to_string(v); },
-          [&](Long v) { return show_long(f, v); },
-          [](Single v) { return show_single(v); },
-          [](Double v) { return show_double(v); },
-          [](Date d) {
-            std::string shown = show_double(d.days) + " days";
-            if (auto iso = iso_text(d)) shown = *iso + " (" + shown + ")";
-            return shown;
-          },
-          [&](bool v) {
-            std::string shown = v ? "True" : "False";
-            const auto at = static_cast<std::size_t>(f.position);
-            if (at < stream.size() && stream[at] > 1) {
-              shown += " (byte " + std::to_string(stream[at]) + "; only 1 reads as True)";
-            }
-            return shown;
-          },
-          [&](std::u16string_view text) {
-            return f.units > 0 ? show_fixed_text(text) : Json(to_utf8(text)).dump();
-          },
-      },
-      f.value);
+  return std::visit(Overloaded{
+                        [&](std::monostate) { return show_filler(f.name); },
+                        [](Byte v) { return std::to_string(v); },
+                        [](Integer v) { return std::to_string(v); },
+                        [&](Long v) { return show_long(f, v); },
+                        [](Single v) { return show_single(v); },
+                        [](Double v) { return show_double(v); },
+                        [](Date d) {
+                          std::string shown = show_double(d.days) + " days";
+                          if (auto iso = iso_text(d)) shown = *iso + " (" + shown + ")";
+                          return shown;
+                        },
+                        [&](bool v) {
+                          std::string shown = v ? "True" : "False";
+                          const auto at = static_cast<std::size_t>(f.position);
+                          if (at < stream.size() && stream[at] > 1) {
+                            shown +=
+                                " (byte " + std::to_string(stream[at]) + "; only 1 reads as True)";
+                          }
+                          return shown;
+                        },
+                        [&](std::u16string_view text) {
+                          return f.units > 0 ? show_fixed_text(text) : Json(to_utf8(text)).dump();
+                        },
+                    },
+                    f.value);
 }
 
 WalkEnd explain_table(StreamKind kind, const ByteArray& bytes, OutputFile& out) {
@@ -211,7 +211,8 @@ WalkEnd explain_table(StreamKind kind, const ByteArray& bytes, OutputFile& out) 
   const std::size_t size_digits = digits(stream.size());
   // A walk that stops names the field where it stops: a path no longer than
   // the longest one walked, or a description of what follows the encoding.
-  const Columns columns{std::max<std::size_t>(size_digits, 6), std::max<std::size_t>(size_digits, 5),
+  const Columns columns{std::max<std::size_t>(size_digits, 6),
+                        std::max<std::size_t>(size_digits, 5),
                         std::max<std::size_t>(23 + 2 + size_digits, 5),
                         std::max({longest.longest, stream_names::kEndOfStream.size(),
                                   stream_names::kSpareByte.size()})};
@@ -223,9 +224,10 @@ WalkEnd explain_table(StreamKind kind, const ByteArray& bytes, OutputFile& out) 
   const WalkEnd end = walk_stream(kind, bytes, rows);
   if (end.problem) {
     const std::size_t at = std::min(end.problem->offset, stream.size());
-    out.write(table_row(columns, std::to_string(at), "", hex_bytes(stream.subspan(at).first(
-                                                             std::min<std::size_t>(stream.size() - at, 8))),
-                        end.problem->field, "<-- stops here"));
+    out.write(
+        table_row(columns, std::to_string(at), "",
+                  hex_bytes(stream.subspan(at).first(std::min<std::size_t>(stream.size() - at, 8))),
+                  end.problem->field, "<-- stops here"));
   }
   out.write("\n" + verdict(kind, end, stream.size()) + "\n");
   return end;

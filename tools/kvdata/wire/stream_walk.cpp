@@ -66,10 +66,10 @@ void finish(StreamKind kind, const ByteArray& bytes, std::size_t end, Walker& wa
     --left;
   }
   if (left > 0) {
-    walker.problem_ = Problem{end, std::string(stream_names::kEndOfStream),
-                              "the end of the " + std::string(kind_name(kind)) +
-                                  " stream; " + std::to_string(left) +
-                                  " more bytes follow that belong to no field"};
+    walker.problem_ =
+        Problem{end, std::string(stream_names::kEndOfStream),
+                "the end of the " + std::string(kind_name(kind)) + " stream; " +
+                    std::to_string(left) + " more bytes follow that belong to no field"};
   }
 }
 
@@ -92,10 +92,10 @@ WalkEnd walk_stream(StreamKind kind, const ByteArray& bytes, WalkSink& sink) {
     walker.rethrow();
   } else if (!walker.problem_) {
     // A refusal the reader did not explain (it ran out of memory, say).
-    walker.problem_ = Problem{walker.end_, std::string(kind_name(kind)),
-                              "what the library's reader could take; it refused the stream here" +
-                                  (read.message.empty() ? std::string() : ": " + read.message) +
-                                  log.summary()};
+    walker.problem_ =
+        Problem{walker.end_, std::string(kind_name(kind)),
+                "what the library's reader could take; it refused the stream here" +
+                    (read.message.empty() ? std::string() : ": " + read.message) + log.summary()};
   }
   return WalkEnd{std::move(walker.problem_), walker.end_};
 }
