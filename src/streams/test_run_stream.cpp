@@ -50,13 +50,19 @@ void put_iia_tile(FieldWriter& out, const tIIATile& tile) {
   }
 }
 
+// Where the values of an IIA tile's spectra go, by geometry: Trial.SCE(band), ...
+constexpr FieldReader::Slot kTrialSlots[] = {
+    {field_name<&tIIATile::Trial>(), FieldReader::sc_name(eSC::SCE)},
+    {field_name<&tIIATile::Trial>(), FieldReader::sc_name(eSC::SCI)}};
+constexpr FieldReader::Slot kProfiledSlots[] = {
+    {field_name<&tIIATile::TrialProfiled>(), FieldReader::sc_name(eSC::SCE)},
+    {field_name<&tIIATile::TrialProfiled>(), FieldReader::sc_name(eSC::SCI)}};
+
 void get_iia_tile(FieldReader& in, tIIATile& tile) {
   FieldReader::Run values = in.run(kIiaTileBytes);
-  for (const eSC sc : {eSC::SCE, eSC::SCI}) {
-    const std::string_view geometry = FieldReader::sc_name(sc);
-    values.get_interleaved(tile.Trial.Spectrum(sc).Data, tile.TrialProfiled.Spectrum(sc).Data,
-                           {field_name<&tIIATile::Trial>(), geometry},
-                           {field_name<&tIIATile::TrialProfiled>(), geometry});
+  for (Long k = 0; k <= 1; ++k) {
+    values.get_interleaved(tile.Trial.Spectrum(k).Data, tile.TrialProfiled.Spectrum(k).Data,
+                           kTrialSlots[k], kProfiledSlots[k]);
   }
 }
 
@@ -175,8 +181,12 @@ bool read_test_run(const ByteArray& stream, Long& position, tTestRun1& run) {
     }
     series.Tiles.redim(1, count);
     for (Long i = 1; i <= count && in.ok(); ++i) {
-      const ObservedRecord tile(observer, field_name<&tIIATileSet::Tiles>(), i);
-      get_iia_tile(in, series.Tiles(i));
+      if (observer == nullptr) {
+        get_iia_tile(in, series.Tiles(i));
+      } else {
+        const ObservedRecord tile(observer, field_name<&tIIATileSet::Tiles>(), i);
+        get_iia_tile(in, series.Tiles(i));
+      }
     }
   }
   if (!in.ok()) return false;

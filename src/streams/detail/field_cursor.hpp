@@ -152,22 +152,21 @@ class FieldReader {
         static_cast<void>(load_le_run(*block_, offset_, values));
         offset_ += kWireWidth<Single> * values.size();
       } else {
-        for (std::size_t i = 0; i < values.size(); ++i) {
-          in_.get_single(values[i], name, static_cast<Long>(i + 1));
-        }
+        const Slot slot{{}, name};
+        in_.ok_ =
+            in_.ok_ && read_each(in_.stream_, in_.position_, in_.observer_, values, {}, slot, slot);
       }
       return *this;
     }
     // a[0], b[0], a[1], b[1], ...; `a` and `b` have the same length.
-    Run& get_interleaved(std::span<Single> a, std::span<Single> b, Slot a_slot, Slot b_slot) {
+    Run& get_interleaved(std::span<Single> a, std::span<Single> b, const Slot& a_slot,
+                         const Slot& b_slot) {
       if (block_) {
         static_cast<void>(load_le_interleaved(*block_, offset_, a, b));
         offset_ += 2 * kWireWidth<Single> * a.size();
       } else {
-        for (std::size_t i = 0; i < a.size(); ++i) {
-          in_.get_single(a[i], a_slot, static_cast<Long>(i + 1));
-          in_.get_single(b[i], b_slot, static_cast<Long>(i + 1));
-        }
+        in_.ok_ =
+            in_.ok_ && read_each(in_.stream_, in_.position_, in_.observer_, a, b, a_slot, b_slot);
       }
       return *this;
     }
@@ -212,9 +211,9 @@ class FieldReader {
   FieldReader& get_single(Single& v, std::string_view name, Long index) {
     return step(checked::read_single, v, name, index);
   }
-  FieldReader& get_single(Single& v, Slot slot, Long index) {
-    if (slot.record.empty() || observer_ == nullptr) return get_single(v, slot.field, index);
-    ObservedRecord inside(observer_, slot.record);
+  FieldReader& get_single(Single& v, const Slot& slot, Long index) {
+    if (observer_ == nullptr || slot.record.empty()) return get_single(v, slot.field, index);
+    const ObservedRecord inside(observer_, slot.record);
     return get_single(v, slot.field, index);
   }
 
@@ -262,43 +261,76 @@ class FieldReader {
   // The observer watching this reader, or nullptr.
   StreamObserver* observer() const { return observer_; }
 
-  static std::string_view sc_name(eSC sc) { return *member_name(sc); }
+  // "SCE", "SCI".
+  static constexpr std::string_view sc_name(eSC sc) { return sc == eSC::SCE ? kSCEName : kSCIName; }
 
  private:
   template <class F, class V>
   FieldReader& step(F read, V& v, std::string_view name, std::optional<Long> index = {}) {
-    if (!ok_) return *this;
-    const Long start = position_;
-    ok_ = read(stream_, position_, v);
     if (observer_ != nullptr) [[unlikely]] {
-      observe(start, v, name, index);
+      ok_ = ok_ && observed_step(read, stream_, position_, v, *observer_, name, index);
+    } else {
+      ok_ = ok_ && read(stream_, position_, v);
     }
     return *this;
   }
 
-  template <class V>
-  void observe(Long start, const V& v, std::string_view name, std::optional<Long> index) {
-    if (ok_) {
-      FieldValue value;
-      if constexpr (std::is_same_v<V, String>) {
-        value = std::u16string_view(v);
-      } else {
-        value = v;
-      }
-      report(observer_, name, start, position_ - start, value, index);
-      return;
+  // The step while someone watches: the value read is reported, or the
+  // failure refused with what was expected. Static, so that the reader
+  // itself never leaves the caller's registers on the path nobody watches.
+  template <class F, class V>
+  [[gnu::noinline, gnu::cold]] static bool observed_step(F read, const ByteArray& stream,
+                                                         Long& position, V& v,
+                                                         StreamObserver& observer,
+                                                         std::string_view name,
+                                                         std::optional<Long> index) {
+    const Long start = position;
+    if (!read(stream, position, v)) {
+      refuse(
+          &observer, start, name, [&] { return expected_at<V>(stream, start); }, index);
+      return false;
     }
-    refuse(
-        observer_, start, name, [&] { return expected_at<V>(start); }, index);
+    FieldValue value;
+    if constexpr (std::is_same_v<V, String>) {
+      value = std::u16string_view(v);
+    } else {
+      value = v;
+    }
+    report(&observer, name, start, position - start, value, index);
+    return true;
+  }
+
+  // The values of a run one by one: a[0], b[0], a[1], b[1], ... (only `a`
+  // when `b` is empty), each at its index from 1 in its slot, observed or
+  // not. False at the first that fails.
+  [[gnu::noinline]] static bool read_each(const ByteArray& stream, Long& position,
+                                          StreamObserver* observer, std::span<Single> a,
+                                          std::span<Single> b, const Slot& a_slot,
+                                          const Slot& b_slot) {
+    const auto one = [&](Single& v, const Slot& slot, std::size_t i) {
+      if (observer == nullptr) return checked::read_single(stream, position, v);
+      const auto index = static_cast<Long>(i + 1);
+      if (slot.record.empty()) {
+        return observed_step(checked::read_single, stream, position, v, *observer, slot.field,
+                             index);
+      }
+      const ObservedRecord inside(observer, slot.record);
+      return observed_step(checked::read_single, stream, position, v, *observer, slot.field, index);
+    };
+    for (std::size_t i = 0; i < a.size(); ++i) {
+      if (!one(a[i], a_slot, i)) return false;
+      if (!b.empty() && !one(b[i], b_slot, i)) return false;
+    }
+    return true;
   }
 
   // What a value of type V needed at `start`, where it failed.
   template <class V>
-  std::string expected_at(Long start) const {
-    const std::size_t left = bytes_from(stream_, start);
+  static std::string expected_at(const ByteArray& stream, Long start) {
+    const std::size_t left = bytes_from(stream, start);
     if constexpr (std::is_same_v<V, String>) {
       Long count = 0;
-      if (!load_le(stream_, start, count)) {
+      if (!load_le(stream, start, count)) {
         return "a String count (Long): " + shortfall(kWireWidth<Long>, left);
       }
       if (count < 0) return "a String count of 0 or more; found " + std::to_string(count);
@@ -317,6 +349,9 @@ class FieldReader {
       return "a Date: " + shortfall(kWireWidth<V>, left);
     }
   }
+
+  static constexpr std::string_view kSCEName = *member_name(eSC::SCE);
+  static constexpr std::string_view kSCIName = *member_name(eSC::SCI);
 
   const ByteArray& stream_;
   Long& position_;

@@ -229,7 +229,11 @@ WalkEnd explain_table(StreamKind kind, const ByteArray& bytes, OutputFile& out) 
                   hex_bytes(stream.subspan(at).first(std::min<std::size_t>(stream.size() - at, 8))),
                   end.problem->field, "<-- stops here"));
   }
-  out.write("\n" + verdict(kind, end, stream.size()) + "\n");
+  // Appended piece by piece (GCC 12 warns falsely about "\n" + text at -O3).
+  std::string tail(1, '\n');
+  tail += verdict(kind, end, stream.size());
+  tail += '\n';
+  out.write(tail);
   return end;
 }
 
