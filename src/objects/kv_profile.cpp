@@ -2,7 +2,6 @@
 
 #include <array>
 #include <bit>
-#include <charconv>
 #include <cstdint>
 #include <optional>
 #include <string>
@@ -62,13 +61,6 @@ std::optional<std::string_view> property_of_record(std::string_view name) {
   return name;
 }
 
-// "1.4" for a refusal: the shortest text that reads back as `value`.
-std::string single_text(Single value) {
-  std::array<char, 32> text{};
-  const auto end = std::to_chars(text.data(), text.data() + text.size(), value).ptr;
-  return std::string(text.data(), end);
-}
-
 // The record reader only reads the stream; the record stream's signature
 // takes it by plain reference for both directions.
 bool read_profile_record(const ByteArray& stream, Long& position, tOVProfile& record) {
@@ -118,11 +110,8 @@ bool KVProfile::IKVStream_StreamIn(const ByteArray& bytStream, Long& Position) {
   const Long stamp_at = Position;
   if (!head.get_single(stamp, stream_names::kStreamVersion).ok()) return false;
   if (stamp != kStreamStamp) {
-    detail::refuse(observer, stamp_at, stream_names::kStreamVersion, [&] {
-      return "the profile stream version stamp " + single_text(kStreamStamp) + "; found " +
-             single_text(stamp) +
-             ", the stamp of another library version or not a stream of this kind";
-    });
+    detail::refuse(observer, stamp_at, stream_names::kStreamVersion,
+                   [&] { return detail::stamp_expected("profile", kStreamStamp, stamp); });
     return false;
   }
 

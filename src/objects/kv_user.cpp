@@ -3,7 +3,6 @@
 #include <algorithm>
 #include <array>
 #include <cassert>
-#include <charconv>
 #include <new>
 #include <span>
 #include <string>
@@ -73,13 +72,6 @@ tUser decode(const Block& block) {
       detail::load_fields(block, kBlock.cells, user, field_name<&tUser::Disabled>());
   assert(inside);
   return user;
-}
-
-// "1.4" for a refusal: the shortest text that reads back as `value`.
-std::string single_text(Single value) {
-  std::array<char, 32> text{};
-  const auto end = std::to_chars(text.data(), text.data() + text.size(), value).ptr;
-  return std::string(text.data(), end);
 }
 
 // Tells the observer where a stream too short for StreamIn ends: in the
@@ -174,12 +166,8 @@ bool KVUser::IKVStream_StreamIn(const ByteArray& bytStream, Long& Position) {
     const Long stamp_at = Position;
     detail::FieldReader(bytStream, Position).get_single(stamp, stream_names::kStreamVersion);
     if (stamp != kStamp) {
-      detail::refuse(observer, stamp_at, stream_names::kStreamVersion, [&] {
-        return "the user stream version stamp " + single_text(kStamp) + "; found " +
-               single_text(stamp) +
-               ", the stamp of another library version or not a stream of "
-               "this kind";
-      });
+      detail::refuse(observer, stamp_at, stream_names::kStreamVersion,
+                     [&] { return detail::stamp_expected("user", kStamp, stamp); });
       raise(kVersionMismatch, kSourceIn, u"Client and Server KVData.DLL versions don't match");
     }
     Block block{};

@@ -9,6 +9,8 @@
 //   ObservedRecord station(o, "Station");                  // enter now, leave at scope end
 //   refuse(o, pos, stream_names::kTileCount, [&] { return "a tile count from 1 to 254"; });
 
+#include <array>
+#include <charconv>
 #include <cstddef>
 #include <optional>
 #include <string>
@@ -91,6 +93,18 @@ inline std::string shortfall(std::size_t needed, std::size_t left) {
   std::string text = std::to_string(needed) + " bytes, but ";
   if (left == 0) return text + "the stream ends here";
   return text + "only " + std::to_string(left) + " are left";
+}
+
+// What a reader that checks a version stamp expected: "the user stream
+// version stamp 1.2; found 1.4, the stamp of another library version ...".
+inline std::string stamp_expected(std::string_view stream, Single expected, Single found) {
+  const auto text = [](Single value) {
+    std::array<char, 32> digits{};
+    const auto end = std::to_chars(digits.data(), digits.data() + digits.size(), value).ptr;
+    return std::string(digits.data(), end);
+  };
+  return "the " + std::string(stream) + " stream version stamp " + text(expected) + "; found " +
+         text(found) + ", the stamp of another library version or not a stream of this kind";
 }
 
 }  // namespace kvdata::detail
