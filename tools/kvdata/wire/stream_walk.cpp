@@ -16,7 +16,8 @@ namespace {
 // to return.
 class Walker : public StreamObserver {
  public:
-  Walker(const ByteArray& bytes, WalkSink& sink) : lower_(bytes.lbound()), sink_(sink) {}
+  Walker(const ByteArray& bytes, WalkSink& sink)
+      : lower_(bytes.has_bounds() ? bytes.lbound() : 0), sink_(sink) {}
 
   void enter(std::string_view name, std::optional<Long> index) override {
     path_.enter(name, index);
