@@ -1,14 +1,23 @@
 #include "kvdata/objects/kv_profile.hpp"
 
+#include <array>
 #include <bit>
 #include <cstdint>
+#include <optional>
+#include <string>
+#include <string_view>
 #include <utility>
 
+#include "kvdata/foundation/record_fields.hpp"
+#include "kvdata/streams/stream_observer.hpp"
 #include "kvdata/streams/streams.hpp"
 #include "objects/detail/object_stream.hpp"
+#include "objects/detail/property_names.hpp"
 #include "objects/detail/working_room.hpp"
 #include "streams/detail/checked_codec.hpp"
 #include "streams/detail/field_cursor.hpp"
+#include "streams/detail/observe.hpp"
+#include "streams/detail/record_streams.hpp"
 
 namespace kvdata {
 namespace {
@@ -26,6 +35,30 @@ Single& at(FixedArray<tSpectrum, 0, 1>& table, const eSC& sc, const Long& WL) {
 }
 const Single& at(const FixedArray<tSpectrum, 0, 1>& table, const eSC& sc, const Long& WL) {
   return table(sc).Data(WL);
+}
+
+using detail::property_name;
+
+// The profile's properties hold the record stream's fields: the record and
+// its ProfileData are no levels of their own, and each table is the
+// correction property that holds it.
+std::optional<std::string_view> property_of_record(std::string_view name) {
+  if (name == detail::kProfileArgument || name == field_name<&tOVProfile::ProfileData>()) {
+    return std::nullopt;
+  }
+  if (name == field_name<&tOVProfileDataV1::wCal>()) {
+    return property_name<KVProfile>("WhiteCorrection");
+  }
+  if (name == field_name<&tOVProfileDataV1::wave>()) {
+    return property_name<KVProfile>("WaveCorrection");
+  }
+  if (name == field_name<&tOVProfileDataV1::Linear>()) {
+    return property_name<KVProfile>("LinearCorrection");
+  }
+  if (name == field_name<&tOVProfileDataV1::Dark>()) {
+    return property_name<KVProfile>("DarkCorrection");
+  }
+  return name;
 }
 
 // The record reader only reads the stream; the record stream's signature
@@ -72,13 +105,19 @@ bool KVProfile::write_stream(ByteArray& stream, Long& position) const {
 
 bool KVProfile::IKVStream_StreamIn(const ByteArray& bytStream, Long& Position) {
   Single stamp = 0.0f;
-  if (!checked::read_single(bytStream, Position, stamp)) return false;
-  if (stamp != kStreamStamp) return false;
+  detail::FieldReader head(bytStream, Position);
+  StreamObserver* const observer = head.observer();
+  const Long stamp_at = Position;
+  if (!head.get_single(stamp, stream_names::kStreamVersion).ok()) return false;
+  if (stamp != kStreamStamp) {
+    detail::refuse(observer, stamp_at, stream_names::kStreamVersion,
+                   [&] { return detail::stamp_expected("profile", kStreamStamp, stamp); });
+    return false;
+  }
 
-  if (!detail::FieldReader(bytStream, Position)
-           .get_long(start_wl_)
-           .get_long(end_wl_)
-           .get_long(interval_)
+  if (!head.get_long(start_wl_, property_name<KVProfile>("StartWL"))
+           .get_long(end_wl_, property_name<KVProfile>("EndWl"))
+           .get_long(interval_, property_name<KVProfile>("Interval"))
            .ok()) {
     return false;
   }
@@ -86,7 +125,14 @@ bool KVProfile::IKVStream_StreamIn(const ByteArray& bytStream, Long& Position) {
   // The record starts from the object's own identity, so that a record
   // stream that stops early replaces only what it read.
   tOVProfile record{isn_, created_, validated_, Variant()};
-  const bool record_ok = read_profile_record(bytStream, Position, record);
+  bool record_ok = false;
+  if (observer == nullptr) {
+    record_ok = read_profile_record(bytStream, Position, record);
+  } else {
+    detail::RenamingObserver as_properties(*observer, property_of_record);
+    const ObservedStreams watch(as_properties);
+    record_ok = read_profile_record(bytStream, Position, record);
+  }
   isn_ = std::move(record.ISN);
   created_ = record.Created;
   validated_ = record.Validated;
@@ -98,7 +144,11 @@ bool KVProfile::IKVStream_StreamIn(const ByteArray& bytStream, Long& Position) {
   tables_ = *tables;
 
   detail::FieldReader tail(bytStream, Position);
-  for (tSpectrum& spectrum : band_width_) tail.get_spectrum(spectrum);
+  const detail::ObservedRecord band_width(observer,
+                                          property_name<KVProfile>("BandWidthCorrection"));
+  for (const eSC sc : {eSC::SCE, eSC::SCI}) {
+    tail.get_spectrum(band_width_(sc), detail::FieldReader::sc_name(sc));
+  }
   return tail.ok();
 }
 

@@ -2,12 +2,19 @@
 
 #include <bit>
 #include <cstdint>
+#include <optional>
+#include <string_view>
 #include <utility>
 
+#include "kvdata/streams/stream_observer.hpp"
 #include "kvdata/streams/streams.hpp"
 #include "objects/detail/object_stream.hpp"
+#include "objects/detail/property_names.hpp"
 #include "objects/detail/working_room.hpp"
 #include "streams/detail/checked_codec.hpp"
+#include "streams/detail/field_cursor.hpp"
+#include "streams/detail/observe.hpp"
+#include "streams/detail/record_streams.hpp"
 
 namespace kvdata {
 namespace {
@@ -33,6 +40,12 @@ bool write_test_run_stream(Single version, tTestRun1& record, const String& ligh
   if (ok) ok = checked::write_string(light_level_data, stream, position);
   detail::resize_stream(stream, position);
   return ok;
+}
+
+// The run's v1TestRun property holds the record stream's record.
+std::optional<std::string_view> property_of_record(std::string_view name) {
+  if (name == detail::kTestRunArgument) return detail::property_name<KVTestRun>("v1TestRun");
+  return name;
 }
 
 // The record reader only reads the stream; the record stream's signature
@@ -74,11 +87,26 @@ bool KVTestRun::IKVStream_StreamOut(ByteArray& bytStream, Long& Position) {
 
 bool KVTestRun::IKVStream_StreamIn(const ByteArray& bytStream, Long& Position) {
   if (Position < 0) return false;
-  if (!checked::read_single(bytStream, Position, version_)) return false;
-  if (!read_test_run_record(bytStream, Position, record_)) return false;
+  detail::FieldReader head(bytStream, Position);
+  StreamObserver* const observer = head.observer();
+  if (!head.get_single(version_, detail::property_name<KVTestRun>("StreamVersion")).ok()) {
+    return false;
+  }
+  bool record_ok = false;
+  if (observer == nullptr) {
+    record_ok = read_test_run_record(bytStream, Position, record_);
+  } else {
+    detail::RenamingObserver as_property(*observer, property_of_record);
+    const ObservedStreams watch(as_property);
+    record_ok = read_test_run_record(bytStream, Position, record_);
+  }
+  if (!record_ok) return false;
   // Read aside so that a text that cannot be read leaves the old one in place.
   String text;
-  if (!checked::read_string(bytStream, Position, text)) return false;
+  detail::FieldReader tail(bytStream, Position);
+  if (!tail.get_string(text, detail::property_name<KVTestRun>("LightLevelData")).ok()) {
+    return false;
+  }
   light_level_data_ = std::move(text);
   return true;
 }

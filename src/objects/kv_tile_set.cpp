@@ -2,15 +2,22 @@
 
 #include <cstddef>
 #include <limits>
+#include <new>
+#include <string_view>
+#include <utility>
 
 #include "automation/detail/failure.hpp"
 #include "kvdata/automation/ansi.hpp"
 #include "kvdata/automation/error.hpp"
 #include "kvdata/objects/kv_tile.hpp"
+#include "kvdata/streams/stream_observer.hpp"
 #include "objects/detail/object_stream.hpp"
+#include "objects/detail/property_names.hpp"
 #include "objects/detail/tile_block.hpp"
 #include "streams/detail/checked_codec.hpp"
+#include "streams/detail/field_cursor.hpp"
 #include "streams/detail/little_endian.hpp"
+#include "streams/detail/observe.hpp"
 
 namespace kvdata {
 namespace {
@@ -31,6 +38,9 @@ bool fits_integer(long long idx) {
 std::size_t tsn_field_bytes(const String& tsn) {
   return detail::kWireWidth<Long> + ansi::encode(tsn).size();
 }
+
+constexpr std::string_view kProperty = detail::property_name<KVTileSet>("v1TileSet");
+constexpr std::string_view kTiles = field_name<&tTileSet::Tiles>();
 
 }  // namespace
 
@@ -98,15 +108,26 @@ Long KVTileSet::IKVTileSet_count() const {
 
 bool KVTileSet::IKVStream_StreamIn(const ByteArray& bytStream, Long& Position) {
   return detail::false_on_failure([&] {
+    detail::FieldReader in(bytStream, Position);
+    StreamObserver* const observer = in.observer();
+    const detail::ObservedRecord property(observer, kProperty);
     String tsn;
-    if (!checked::read_string(bytStream, Position, tsn)) return false;
+    if (!in.get_string(tsn, field_name<&tTileSet::TSN>()).ok()) return false;
     record_.TSN = std::move(tsn);
     const long long lower = record_.Tiles.lbound();
     const long long upper = record_.Tiles.ubound();
     for (long long i = lower; i <= upper; ++i) {
       if (!fits_integer(i)) return false;
       detail::TileBlock block{};
-      if (!detail::take_block(bytStream, Position, block)) return false;
+      const Long start = Position;
+      const bool whole = detail::take_block(bytStream, Position, block);
+      if (observer != nullptr) {
+        const detail::ObservedRecord tile(observer, kTiles, static_cast<Long>(i));
+        const auto taken = static_cast<std::size_t>(static_cast<long long>(Position) - start);
+        static_cast<void>(
+            detail::observe_tile(*observer, std::span<const Byte>(block).first(taken), start));
+      }
+      if (!whole) return false;
       if (is_tile_index(i)) record_.Tiles(static_cast<Long>(i)) = detail::decode_tile(block);
     }
     return true;
@@ -120,11 +141,14 @@ bool KVTileSet::IKVStream_StreamOut(ByteArray& bytStream, Long& Position) {
     const std::size_t total = tsn_field_bytes(record_.TSN) + tiles * detail::kTileBlockBytes;
     detail::resize_stream(bytStream, detail::index_after(Position, total));
     if (!checked::write_string(record_.TSN, bytStream, Position)) return false;
+    StreamObserver* const observer = stream_observer();
+    const detail::ObservedRecord property(observer, kProperty);
     const long long lower = record_.Tiles.lbound();
     const long long upper = record_.Tiles.ubound();
     for (long long i = lower; i <= upper; ++i) {
+      const detail::ObservedRecord tile(observer, kTiles, static_cast<Long>(i));
       detail::TileBlock block{};
-      detail::encode_tile(record_.Tiles(static_cast<Long>(i)), block);
+      detail::encode_tile(record_.Tiles(static_cast<Long>(i)), block, Position);
       if (!detail::put_block(bytStream, Position, block)) return false;
     }
     return true;

@@ -6,25 +6,37 @@
 #include "automation/detail/failure.hpp"
 #include "kvdata/automation/error.hpp"
 #include "kvdata/automation/text.hpp"
+#include "kvdata/streams/stream_observer.hpp"
 #include "objects/detail/object_stream.hpp"
+#include "objects/detail/property_names.hpp"
 #include "objects/detail/record_image.hpp"
+#include "streams/detail/block_layout.hpp"
+#include "streams/detail/observe.hpp"
 
 namespace kvdata {
 namespace {
 
-// The header record, as offsets into its byte image.
-constexpr std::size_t kIdOffset = 0;
-constexpr std::size_t kInstTypeIdOffset = 4;
-constexpr std::size_t kCreateDateOffset = 8;
-constexpr std::size_t kDescriptionOffset = 16;
-constexpr std::size_t kDescriptionUnits = 255;
-constexpr std::size_t kGapOffset = 526;  // alignment gap, 2 bytes
-constexpr std::size_t kCountOffset = 528;
+using detail::property_name;
 
-static_assert(kDescriptionOffset == kCreateDateOffset + 8);
-static_assert(kGapOffset == kDescriptionOffset + 2 * kDescriptionUnits);
-static_assert(kCountOffset == kGapOffset + 2);
-static_assert(kCountOffset + 4 == KVTolSet::kHeaderBytes);
+// The header record's byte image, and the byte the stream carries after it.
+constexpr auto kHeaderLayout = detail::block_layout<7>({
+    detail::long_cell(property_name<KVTolSet>("ID")),
+    detail::long_cell(property_name<KVTolSet>("InstTypeID")),
+    detail::date_cell(property_name<KVTolSet>("CreateDate")),
+    detail::text_cell(property_name<KVTolSet>("Description"), 255),
+    detail::gap_cell(stream_names::kAlignmentGap, 2),
+    detail::long_cell(stream_names::kMemberCount),
+    detail::gap_cell(stream_names::kTrailingByte, 1),
+});
+static_assert(kHeaderLayout.bytes == KVTolSet::kHeaderStreamBytes);
+static_assert(kHeaderLayout.at(stream_names::kTrailingByte).offset == KVTolSet::kHeaderBytes);
+
+constexpr const detail::Cell& kId = kHeaderLayout.at("ID");
+constexpr const detail::Cell& kInstTypeId = kHeaderLayout.at("InstTypeID");
+constexpr const detail::Cell& kCreateDate = kHeaderLayout.at("CreateDate");
+constexpr const detail::Cell& kDescription = kHeaderLayout.at("Description");
+constexpr const detail::Cell& kCount = kHeaderLayout.at(stream_names::kMemberCount);
+constexpr std::string_view kMembers = property_name<KVTolSet>("Tolerances");
 
 constexpr char16_t kMissingName[] = u"MISSING";
 constexpr char16_t kMissingDescription[] = u"Missing Tolerance ";
@@ -63,34 +75,34 @@ Variant KVTolSet::IKVObj_DateCreated() const {
 }
 
 Long KVTolSet::IKVTolSet_InstTypeID() const {
-  return detail::get_field<Long>(header_, kInstTypeIdOffset);
+  return detail::get_field<Long>(header_, kInstTypeId);
 }
 void KVTolSet::IKVTolSet_InstTypeID(Long value) {
-  detail::set_field(header_, kInstTypeIdOffset, value);
+  detail::set_field(header_, kInstTypeId, value);
 }
 
 Variant KVTolSet::IKVTolSet_Description() const {
-  return Variant(detail::get_text_field(header_, kDescriptionOffset, kDescriptionUnits));
+  return Variant(detail::get_text_field(header_, kDescription));
 }
 void KVTolSet::IKVTolSet_Description_Let(const Variant& value) {
-  detail::set_text_field(header_, kDescriptionOffset, kDescriptionUnits, value.to_string());
+  detail::set_text_field(header_, kDescription, value.to_string());
 }
 void KVTolSet::IKVTolSet_Description_Set(const Variant& value) {
   IKVTolSet_Description_Let(value);
 }
 
 Long KVTolSet::IKVTolSet_ID() const {
-  return detail::get_field<Long>(header_, kIdOffset);
+  return detail::get_field<Long>(header_, kId);
 }
 void KVTolSet::IKVTolSet_ID(Long value) {
-  detail::set_field(header_, kIdOffset, value);
+  detail::set_field(header_, kId, value);
 }
 
 Date KVTolSet::IKVTolSet_CreateDate() const {
-  return detail::get_field<Date>(header_, kCreateDateOffset);
+  return detail::get_field<Date>(header_, kCreateDate);
 }
 void KVTolSet::IKVTolSet_CreateDate(Date value) {
-  detail::set_field(header_, kCreateDateOffset, value);
+  detail::set_field(header_, kCreateDate, value);
 }
 
 void KVTolSet::IKVTolSet_Add(const std::shared_ptr<IKVTolerance>& newTol, const String& sKey) {
@@ -155,7 +167,7 @@ void KVTolSet::clear_members() {
 }
 
 void KVTolSet::record_member_count() {
-  detail::set_field(header_, kCountOffset, IKVTolSet_count());
+  detail::set_field(header_, kCount, IKVTolSet_count());
 }
 
 Long KVTolSet::IKVStream_StreamLen() const {
@@ -194,13 +206,22 @@ bool KVTolSet::IKVStream_StreamIn(const ByteArray& bytStream, Long& Position) {
   return detail::false_on_failure([&] {
     clear_members();
     std::array<Byte, kHeaderStreamBytes> image{};
-    if (!detail::take_block(bytStream, Position, image)) return false;
+    const Long start = Position;
+    const bool whole = detail::take_block(bytStream, Position, image);
+    StreamObserver* const observer = stream_observer();
+    if (observer != nullptr) {
+      const auto taken = static_cast<std::size_t>(static_cast<long long>(Position) - start);
+      static_cast<void>(detail::observe_block(*observer, kHeaderLayout.cells,
+                                              std::span<const Byte>(image).first(taken), start));
+    }
+    if (!whole) return false;
     std::copy_n(image.begin(), kHeaderBytes, header_.begin());
 
     // Each member needs its own 749 bytes, so a count larger than the stream
     // can hold stops at the first member that runs out of bytes.
-    const Long count = detail::get_field<Long>(header_, kCountOffset);
+    const Long count = detail::get_field<Long>(header_, kCount);
     for (Long i = 0; i < count; ++i) {
+      const detail::ObservedRecord member(observer, kMembers, i + 1);
       auto tol = KVTolerance::create();
       if (!tol->StreamIn(bytStream, Position)) return false;
       IKVTolSet_Add(tol, id_key(tol->ID()));

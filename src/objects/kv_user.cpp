@@ -1,17 +1,24 @@
 #include "kvdata/objects/kv_user.hpp"
 
+#include <algorithm>
 #include <array>
 #include <cassert>
 #include <span>
+#include <string>
+#include <string_view>
 
 #include "automation/detail/failure.hpp"
 #include "kvdata/automation/error.hpp"
 #include "kvdata/automation/text.hpp"
-#include "kvdata/streams/field_codec.hpp"
+#include "kvdata/foundation/record_fields.hpp"
+#include "kvdata/streams/stream_observer.hpp"
 #include "objects/detail/object_stream.hpp"
+#include "objects/detail/property_names.hpp"
+#include "streams/detail/block_layout.hpp"
 #include "streams/detail/checked_codec.hpp"
-#include "streams/detail/fixed_text.hpp"
+#include "streams/detail/field_cursor.hpp"
 #include "streams/detail/little_endian.hpp"
+#include "streams/detail/observe.hpp"
 
 namespace kvdata {
 namespace {
@@ -19,34 +26,25 @@ namespace {
 constexpr Single kStamp = 1.2f;
 constexpr std::size_t kStampBytes = 4;
 
-// The block after the stamp, as offsets from its start.
-constexpr std::size_t kUserIdOffset = 0;
-constexpr std::size_t kUserIdUnits = 30;
-constexpr std::size_t kUserNumberOffset = 60;
-constexpr std::size_t kLastNameOffset = 64;
-constexpr std::size_t kLastNameUnits = 50;
-constexpr std::size_t kFirstNameOffset = 164;
-constexpr std::size_t kFirstNameUnits = 50;
-constexpr std::size_t kUserPwdOffset = 264;
-constexpr std::size_t kUserPwdUnits = 30;
-constexpr std::size_t kUserMailOffset = 324;
-constexpr std::size_t kUserMailUnits = 255;
-constexpr std::size_t kGapOffset = 834;  // alignment gap, 2 bytes, written as 0
-constexpr std::size_t kOrgIdOffset = 836;
-constexpr std::size_t kRoleCodeOffset = 840;
-constexpr std::size_t kDisabledOffset = 842;
-constexpr std::size_t kBlockBytes = 844;
+// The block after the stamp.
+constexpr auto kBlock = detail::block_layout<10>({
+    detail::text_cell(field_name<&tUser::USERID>(), 30),
+    detail::long_cell(field_name<&tUser::UserNumber>()),
+    detail::text_cell(field_name<&tUser::LastName>(), 50),
+    detail::text_cell(field_name<&tUser::FirstName>(), 50),
+    detail::text_cell(field_name<&tUser::UserPWD>(), 30),
+    detail::text_cell(field_name<&tUser::UserMail>(), 255),
+    detail::gap_cell(stream_names::kAlignmentGap, 2),
+    detail::long_cell(field_name<&tUser::OrgID>()),
+    detail::text_cell(field_name<&tUser::RoleCode>(), 1),
+    detail::text_cell(field_name<&tUser::Disabled>(), 1),
+});
+static_assert(kBlock.bytes == 844);
+static_assert(kStampBytes + kBlock.bytes == KVUser::kStreamBytes);
 
-static_assert(kUserNumberOffset == kUserIdOffset + 2 * kUserIdUnits);
-static_assert(kFirstNameOffset == kLastNameOffset + 2 * kLastNameUnits);
-static_assert(kUserPwdOffset == kFirstNameOffset + 2 * kFirstNameUnits);
-static_assert(kUserMailOffset == kUserPwdOffset + 2 * kUserPwdUnits);
-static_assert(kGapOffset == kUserMailOffset + 2 * kUserMailUnits);
-static_assert(kOrgIdOffset == kGapOffset + 2);
-static_assert(kDisabledOffset + 2 == kBlockBytes);
-static_assert(kStampBytes + kBlockBytes == KVUser::kStreamBytes);
+constexpr std::string_view kProperty = detail::property_name<KVUser>("v1User");
 
-using Block = std::array<Byte, kBlockBytes>;
+using Block = std::array<Byte, kBlock.bytes>;
 
 // Failures of the stream operations, each with its own number.
 constexpr Long kStreamTooSmall = 1;
@@ -55,42 +53,24 @@ constexpr Long kPositionInvalid = 3;
 constexpr char16_t kSourceIn[] = u"KVData.KVUser.StreamIn";
 constexpr char16_t kSourceOut[] = u"KVData.KVUser.StreamOut";
 
-Block encode(const tUser& user) {
+// The block of `user`; the observer installed on this thread sees each
+// text as given, at stream index `position` plus its offset.
+Block encode(const tUser& user, Long position) {
   Block block{};
-  const bool inside =
-      detail::store_fixed_text(block, kUserIdOffset, kUserIdUnits, user.USERID) &&
-      detail::store_le(std::span<Byte>(block), kUserNumberOffset, user.UserNumber) &&
-      detail::store_fixed_text(block, kLastNameOffset, kLastNameUnits, user.LastName) &&
-      detail::store_fixed_text(block, kFirstNameOffset, kFirstNameUnits, user.FirstName) &&
-      detail::store_fixed_text(block, kUserPwdOffset, kUserPwdUnits, user.UserPWD) &&
-      detail::store_fixed_text(block, kUserMailOffset, kUserMailUnits, user.UserMail) &&
-      detail::store_le(std::span<Byte>(block), kOrgIdOffset, user.OrgID) &&
-      detail::store_fixed_text(block, kRoleCodeOffset, 1, user.RoleCode) &&
-      detail::store_fixed_text(block, kDisabledOffset, 1, user.Disabled);
+  StreamObserver* const observer = stream_observer();
+  const detail::ObservedRecord property(observer, kProperty);
+  [[maybe_unused]] const bool inside =
+      detail::store_fields(user, kBlock.cells, block, observer, position);
   assert(inside);
-  static_cast<void>(inside);
   return block;
 }
 
 tUser decode(const Block& block) {
   tUser user;
-  const bool inside =
-      detail::load_fixed_text(block, kUserIdOffset, kUserIdUnits, user.USERID) &&
-      detail::load_le(std::span<const Byte>(block), kUserNumberOffset, user.UserNumber) &&
-      detail::load_fixed_text(block, kLastNameOffset, kLastNameUnits, user.LastName) &&
-      detail::load_fixed_text(block, kFirstNameOffset, kFirstNameUnits, user.FirstName) &&
-      detail::load_fixed_text(block, kUserPwdOffset, kUserPwdUnits, user.UserPWD) &&
-      detail::load_fixed_text(block, kUserMailOffset, kUserMailUnits, user.UserMail) &&
-      detail::load_le(std::span<const Byte>(block), kOrgIdOffset, user.OrgID) &&
-      detail::load_fixed_text(block, kRoleCodeOffset, 1, user.RoleCode) &&
-      detail::load_fixed_text(block, kDisabledOffset, 1, user.Disabled);
-  assert(inside);
-  static_cast<void>(inside);
   // Disabled keeps its unit as it is, a blank included.
-  for (String* text : {&user.USERID, &user.LastName, &user.FirstName, &user.UserPWD, &user.UserMail,
-                       &user.RoleCode}) {
-    *text = trim_blanks(*text);
-  }
+  [[maybe_unused]] const bool inside =
+      detail::load_fields(block, kBlock.cells, user, field_name<&tUser::Disabled>());
+  assert(inside);
   return user;
 }
 
@@ -100,6 +80,40 @@ auto keeping_message_in(String& err_msg) {
     err_msg = e != nullptr ? e->description() : standard_description(number);
     return false;
   };
+}
+
+// Tells the observer where a stream too short for StreamIn ends: in the
+// stamp, in a field of the block, or where the spare byte should be. The
+// reader takes nothing from such a stream.
+void refuse_short(StreamObserver& observer, const ByteArray& stream, Long position) {
+  const long long ends = std::max<long long>(position, stream.ubound() + 1LL);
+  const auto held = static_cast<std::size_t>(ends - position);
+  const std::string nothing_taken =
+      "; the user reader takes nothing from a stream that does not reach one byte past the "
+      "encoding, where the writer leaves a spare byte";
+  if (held == KVUser::kStreamBytes) {
+    detail::refuse(&observer, static_cast<Long>(ends), stream_names::kSpareByte,
+                   [&] { return "one more byte" + nothing_taken; });
+    return;
+  }
+  if (held < kStampBytes) {
+    detail::refuse(&observer, position, stream_names::kStreamVersion, [&] {
+      return "a Single: " + detail::shortfall(kStampBytes, held) + nothing_taken;
+    });
+    return;
+  }
+  const std::size_t in_block = held - kStampBytes;
+  for (const detail::Cell& cell : kBlock.cells) {
+    if (in_block < cell.offset + cell.bytes()) {
+      const detail::ObservedRecord property(&observer, kProperty);
+      detail::refuse(
+          &observer, position + static_cast<Long>(kStampBytes + cell.offset), cell.name, [&] {
+            return detail::cell_words(cell) + ": " +
+                   detail::shortfall(cell.bytes(), in_block - cell.offset) + nothing_taken;
+          });
+      return;
+    }
+  }
 }
 
 }  // namespace
@@ -131,7 +145,7 @@ bool KVUser::IKVStream_StreamOut(ByteArray& bytStream, Long& Position) {
       raise(kPositionInvalid, kSourceOut, u"Position value was not initialized properly");
     }
     const Long end = detail::index_after(Position, kStreamBytes);
-    const Block block = encode(user_);
+    const Block block = encode(user_, end - static_cast<Long>(kBlock.bytes));
     detail::resize_stream(bytStream, end);
     if (!checked::write_single(kStamp, bytStream, Position) ||
         !detail::put_block(bytStream, Position, block)) {
@@ -142,19 +156,32 @@ bool KVUser::IKVStream_StreamOut(ByteArray& bytStream, Long& Position) {
 }
 
 bool KVUser::IKVStream_StreamIn(const ByteArray& bytStream, Long& Position) {
+  StreamObserver* const observer = stream_observer();
   return detail::on_failure(keeping_message_in(err_msg_), [&] {
     // The array must reach one index beyond the encoding, as StreamOut leaves it.
-    if (static_cast<long long>(bytStream.ubound()) <
-        static_cast<long long>(Position) + static_cast<long long>(kStreamBytes)) {
+    const long long needed_end = static_cast<long long>(Position) + static_cast<long long>(kStreamBytes);
+    if (static_cast<long long>(bytStream.ubound()) < needed_end) {
+      if (observer != nullptr) refuse_short(*observer, bytStream, Position);
       raise(kStreamTooSmall, kSourceIn, u"Stream is too small to contain user structure");
     }
     Single stamp = 0;  // stays 0 when the stamp cannot be read
-    SingleFromArray(bytStream, Position, stamp);
+    const Long stamp_at = Position;
+    detail::FieldReader(bytStream, Position).get_single(stamp, stream_names::kStreamVersion);
     if (stamp != kStamp) {
+      detail::refuse(observer, stamp_at, stream_names::kStreamVersion,
+                     [&] { return detail::stamp_expected("user", kStamp, stamp); });
       raise(kVersionMismatch, kSourceIn, u"Client and Server KVData.DLL versions don't match");
     }
     Block block{};
-    if (!detail::take_block(bytStream, Position, block)) raise(kSubscriptOutOfRange);
+    const Long start = Position;
+    const bool whole = detail::take_block(bytStream, Position, block);
+    if (observer != nullptr) {
+      const detail::ObservedRecord property(observer, kProperty);
+      const auto taken = static_cast<std::size_t>(static_cast<long long>(Position) - start);
+      static_cast<void>(detail::observe_block(*observer, kBlock.cells,
+                                              std::span<const Byte>(block).first(taken), start));
+    }
+    if (!whole) raise(kSubscriptOutOfRange);
     user_ = decode(block);
     return true;
   });

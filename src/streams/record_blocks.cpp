@@ -8,9 +8,12 @@
 #include <span>
 #include <utility>
 
-#include "kvdata/automation/text.hpp"
+#include "kvdata/foundation/record_fields.hpp"
+#include "kvdata/streams/stream_observer.hpp"
+#include "streams/detail/block_layout.hpp"
 #include "streams/detail/fixed_text.hpp"
 #include "streams/detail/little_endian.hpp"
+#include "streams/detail/observe.hpp"
 #include "streams/detail/record_streams.hpp"
 
 namespace kvdata::detail {
@@ -18,53 +21,35 @@ namespace {
 
 // The flat user image. Only its first 261 bytes travel: the high byte of
 // RoleCode and the whole of Disabled are left out.
-constexpr std::size_t kUserIdOffset = 0;
-constexpr std::size_t kUserIdUnits = 8;
-constexpr std::size_t kUserNumberOffset = 16;
-constexpr std::size_t kLastNameOffset = 20;
-constexpr std::size_t kLastNameUnits = 30;
-constexpr std::size_t kFirstNameOffset = 80;
-constexpr std::size_t kFirstNameUnits = 30;
-constexpr std::size_t kUserPwdOffset = 140;
-constexpr std::size_t kUserPwdUnits = 8;
-constexpr std::size_t kUserMailOffset = 156;
-constexpr std::size_t kUserMailUnits = 50;
-constexpr std::size_t kOrgIdOffset = 256;
-constexpr std::size_t kRoleCodeOffset = 260;
-constexpr std::size_t kDisabledOffset = 262;
-constexpr std::size_t kFlagUnits = 1;
-constexpr std::size_t kUserImageBytes = 264;
-
-static_assert(kUserNumberOffset == kUserIdOffset + text_bytes(kUserIdUnits));
-static_assert(kLastNameOffset == kUserNumberOffset + 4);
-static_assert(kFirstNameOffset == kLastNameOffset + text_bytes(kLastNameUnits));
-static_assert(kUserPwdOffset == kFirstNameOffset + text_bytes(kFirstNameUnits));
-static_assert(kUserMailOffset == kUserPwdOffset + text_bytes(kUserPwdUnits));
-static_assert(kOrgIdOffset == kUserMailOffset + text_bytes(kUserMailUnits));
-static_assert(kRoleCodeOffset == kOrgIdOffset + 4);
-static_assert(kDisabledOffset == kRoleCodeOffset + text_bytes(kFlagUnits));
-static_assert(kUserImageBytes == kDisabledOffset + text_bytes(kFlagUnits));
-static_assert(kUserStreamBlockBytes == kRoleCodeOffset + 1);
+constexpr auto kUserImage = block_layout<9>({
+    text_cell(field_name<&tUser::USERID>(), 8),
+    long_cell(field_name<&tUser::UserNumber>()),
+    text_cell(field_name<&tUser::LastName>(), 30),
+    text_cell(field_name<&tUser::FirstName>(), 30),
+    text_cell(field_name<&tUser::UserPWD>(), 8),
+    text_cell(field_name<&tUser::UserMail>(), 50),
+    long_cell(field_name<&tUser::OrgID>()),
+    text_cell(field_name<&tUser::RoleCode>(), 1),
+    text_cell(field_name<&tUser::Disabled>(), 1),
+});
+constexpr const Cell& kRoleCode = kUserImage.at(field_name<&tUser::RoleCode>());
+static_assert(kUserImage.bytes == 264);
+static_assert(kUserStreamBlockBytes == kRoleCode.offset + 1);
+// The cells that travel whole: all before RoleCode.
+constexpr std::span<const Cell> kUserWholeCells = std::span(kUserImage.cells).first(7);
+static_assert(kUserWholeCells.back().offset + kUserWholeCells.back().bytes() == kRoleCode.offset);
 
 // The organisation block; its last three bytes are zero.
-constexpr std::size_t kOrgIdFieldOffset = 0;
-constexpr std::size_t kOrganizationOffset = 4;
-constexpr std::size_t kOrganizationUnits = 50;
-constexpr std::size_t kParentOrgIdOffset = 104;
-constexpr std::size_t kRootOrgIdOffset = 108;
-constexpr std::size_t kAliasOffset = 112;
-constexpr std::size_t kAliasUnits = 8;
-constexpr std::size_t kAvailOffset = 128;
-constexpr std::size_t kOrgPaddingOffset = 130;
-constexpr std::size_t kOrgPaddingBytes = 3;
-
-static_assert(kOrganizationOffset == kOrgIdFieldOffset + 4);
-static_assert(kParentOrgIdOffset == kOrganizationOffset + text_bytes(kOrganizationUnits));
-static_assert(kRootOrgIdOffset == kParentOrgIdOffset + 4);
-static_assert(kAliasOffset == kRootOrgIdOffset + 4);
-static_assert(kAvailOffset == kAliasOffset + text_bytes(kAliasUnits));
-static_assert(kOrgPaddingOffset == kAvailOffset + text_bytes(kFlagUnits));
-static_assert(kOrganizationBlockBytes == kOrgPaddingOffset + kOrgPaddingBytes);
+constexpr auto kOrganizationBlock = block_layout<7>({
+    long_cell(field_name<&tOrganization::ID>()),
+    text_cell(field_name<&tOrganization::Organization>(), 50),
+    long_cell(field_name<&tOrganization::ParentOrgID>()),
+    long_cell(field_name<&tOrganization::RootOrgID>()),
+    text_cell(field_name<&tOrganization::Alias>(), 8),
+    text_cell(field_name<&tOrganization::Avail>(), 1),
+    gap_cell(stream_names::kZeroBytes, 3),
+});
+static_assert(kOrganizationBlock.bytes == kOrganizationBlockBytes);
 
 // Bytes of a block that fit in the stream from Position on, capped so that
 // Position + count stays a Long.
@@ -98,78 +83,75 @@ bool copy_in(const ByteArray& stream, Long& position, std::span<Byte> block) {
   return n == block.size();
 }
 
-// A text field of a block read back without its blank padding.
-bool load_trimmed(std::span<const Byte> in, std::size_t offset, std::size_t units, String& text) {
-  String raw;
-  if (!load_fixed_text(in, offset, units, raw)) return false;
-  text = trim_blanks(raw);
-  return true;
+// Reports the user block read from `present` (as many of its 261 bytes as
+// the stream held): the whole cells, then the one byte of RoleCode.
+void observe_user_block(StreamObserver& observer, std::span<const Byte> present, Long position) {
+  if (!observe_block(observer, kUserWholeCells, present, position)) return;
+  const Long at = position + static_cast<Long>(kRoleCode.offset);
+  if (present.size() <= kRoleCode.offset) {
+    refuse(&observer, at, kRoleCode.name,
+           [] { return "the low byte of RoleCode's one code unit: " + shortfall(1, 0); });
+    return;
+  }
+  const String unit(1, static_cast<char16_t>(present[kRoleCode.offset]));
+  report(&observer, kRoleCode.name, at, 1, std::u16string_view(unit), std::nullopt, 1);
 }
 
 }  // namespace
 
 bool write_user_block(const tUser& user, ByteArray& stream, Long& position) {
-  std::array<Byte, kUserImageBytes> image{};
+  StreamObserver* const observer = stream_observer();
+  const ObservedRecord record(observer, kUserArgument);
+  std::array<Byte, kUserImage.bytes> image{};
   const std::span<Byte> out(image);
-  const bool built = store_fixed_text(out, kUserIdOffset, kUserIdUnits, user.USERID) &&
-                     store_le(out, kUserNumberOffset, user.UserNumber) &&
-                     store_fixed_text(out, kLastNameOffset, kLastNameUnits, user.LastName) &&
-                     store_fixed_text(out, kFirstNameOffset, kFirstNameUnits, user.FirstName) &&
-                     store_fixed_text(out, kUserPwdOffset, kUserPwdUnits, user.UserPWD) &&
-                     store_fixed_text(out, kUserMailOffset, kUserMailUnits, user.UserMail) &&
-                     store_le(out, kOrgIdOffset, user.OrgID) &&
-                     store_fixed_text(out, kRoleCodeOffset, kFlagUnits, user.RoleCode) &&
-                     store_fixed_text(out, kDisabledOffset, kFlagUnits, user.Disabled);
-  if (!built) return false;
+  // Disabled (the last cell) does not travel: it is stored unreported.
+  const std::span<const Cell> cells(kUserImage.cells);
+  if (!store_fields(user, cells.first(cells.size() - 1), out, observer, position) ||
+      !store_fields(user, cells.last(1), out)) {
+    return false;
+  }
   return copy_out(out.first(kUserStreamBlockBytes), stream, position);
 }
 
 bool read_user_block(const ByteArray& stream, Long& position, tUser& user) {
-  std::array<Byte, kUserImageBytes> image{};  // bytes past the block stay zero
-  if (!copy_in(stream, position, std::span<Byte>(image).first(kUserStreamBlockBytes))) return false;
-  const std::span<const Byte> in(image);
+  StreamObserver* const observer = stream_observer();
+  const ObservedRecord record(observer, kUserArgument);
+  std::array<Byte, kUserImage.bytes> image{};  // bytes past the block stay zero
+  const Long start = position;
+  const bool whole = copy_in(stream, position, std::span<Byte>(image).first(kUserStreamBlockBytes));
+  if (observer != nullptr) {
+    const auto taken = static_cast<std::size_t>(static_cast<long long>(position) - start);
+    observe_user_block(*observer, std::span<const Byte>(image).first(taken), start);
+  }
+  if (!whole) return false;
   tUser fresh;
-  const bool parsed = load_trimmed(in, kUserIdOffset, kUserIdUnits, fresh.USERID) &&
-                      load_le(in, kUserNumberOffset, fresh.UserNumber) &&
-                      load_trimmed(in, kLastNameOffset, kLastNameUnits, fresh.LastName) &&
-                      load_trimmed(in, kFirstNameOffset, kFirstNameUnits, fresh.FirstName) &&
-                      load_trimmed(in, kUserPwdOffset, kUserPwdUnits, fresh.UserPWD) &&
-                      load_trimmed(in, kUserMailOffset, kUserMailUnits, fresh.UserMail) &&
-                      load_le(in, kOrgIdOffset, fresh.OrgID) &&
-                      load_trimmed(in, kRoleCodeOffset, kFlagUnits, fresh.RoleCode) &&
-                      load_trimmed(in, kDisabledOffset, kFlagUnits, fresh.Disabled);
-  if (!parsed) return false;
+  if (!load_fields(image, kUserImage.cells, fresh)) return false;
   user = std::move(fresh);
   return true;
 }
 
 bool write_organization_block(const tOrganization& org, ByteArray& stream, Long& position) {
-  std::array<Byte, kOrganizationBlockBytes> block{};  // the padding stays zero
-  const std::span<Byte> out(block);
-  const bool built =
-      store_le(out, kOrgIdFieldOffset, org.ID) &&
-      store_fixed_text(out, kOrganizationOffset, kOrganizationUnits, org.Organization) &&
-      store_le(out, kParentOrgIdOffset, org.ParentOrgID) &&
-      store_le(out, kRootOrgIdOffset, org.RootOrgID) &&
-      store_fixed_text(out, kAliasOffset, kAliasUnits, org.Alias) &&
-      store_fixed_text(out, kAvailOffset, kFlagUnits, org.Avail);
-  if (!built) return false;
-  return copy_out(out, stream, position);
+  StreamObserver* const observer = stream_observer();
+  const ObservedRecord record(observer, kOrganizationArgument);
+  std::array<Byte, kOrganizationBlock.bytes> block{};  // the padding stays zero
+  if (!store_fields(org, kOrganizationBlock.cells, block, observer, position)) return false;
+  return copy_out(block, stream, position);
 }
 
 bool read_organization_block(const ByteArray& stream, Long& position, tOrganization& org) {
-  std::array<Byte, kOrganizationBlockBytes> block{};
-  if (!copy_in(stream, position, block)) return false;
-  const std::span<const Byte> in(block);
+  StreamObserver* const observer = stream_observer();
+  const ObservedRecord record(observer, kOrganizationArgument);
+  std::array<Byte, kOrganizationBlock.bytes> block{};
+  const Long start = position;
+  const bool whole = copy_in(stream, position, block);
+  if (observer != nullptr) {
+    const auto taken = static_cast<std::size_t>(static_cast<long long>(position) - start);
+    static_cast<void>(observe_block(*observer, kOrganizationBlock.cells,
+                                    std::span<const Byte>(block).first(taken), start));
+  }
+  if (!whole) return false;
   tOrganization fresh;
-  const bool parsed =
-      load_le(in, kOrgIdFieldOffset, fresh.ID) &&
-      load_trimmed(in, kOrganizationOffset, kOrganizationUnits, fresh.Organization) &&
-      load_le(in, kParentOrgIdOffset, fresh.ParentOrgID) &&
-      load_le(in, kRootOrgIdOffset, fresh.RootOrgID) &&
-      load_trimmed(in, kAliasOffset, kAliasUnits, fresh.Alias) &&
-      load_trimmed(in, kAvailOffset, kFlagUnits, fresh.Avail);
-  if (!parsed) return false;
+  if (!load_fields(block, kOrganizationBlock.cells, fresh)) return false;
   org = std::move(fresh);
   return true;
 }

@@ -2,18 +2,22 @@
 // profile and station.
 
 #include <cstddef>
+#include <string>
 #include <string_view>
 #include <utility>
 
+#include "kvdata/automation/text.hpp"
+#include "kvdata/foundation/record_fields.hpp"
 #include "streams/detail/field_cursor.hpp"
 #include "streams/detail/little_endian.hpp"
+#include "streams/detail/observe.hpp"
 #include "streams/detail/record_streams.hpp"
 
 namespace kvdata::detail {
 namespace {
 
 // Type name of the profile tables, carried in the profile stream.
-constexpr std::u16string_view kProfileDataTypeName = u"tOVProfileDataV1";
+constexpr std::u16string_view kProfileDataTypeName = RecordTraits<tOVProfileDataV1>::kTypeName;
 
 // Fewest bytes a tile of the tile-set stream can take: an empty Name (its
 // count), ColorRGB, TempComp, and its certified pair of spectra.
@@ -29,7 +33,9 @@ bool write_sc_pair(const tSCPair& pair, ByteArray& stream, Long& position) {
 }
 
 bool read_sc_pair(const ByteArray& stream, Long& position, tSCPair& pair) {
-  return FieldReader(stream, position).get_sc_pair(pair).ok();
+  FieldReader in(stream, position);
+  const ObservedRecord scp(in.observer(), kSCPairArgument);
+  return in.get_sc_pair(pair).ok();
 }
 
 bool write_tile_set_calibration(const tTileSet& set, const tTileSetCalibration& calibration,
@@ -61,24 +67,51 @@ bool read_tile_set_calibration(const ByteArray& stream, Long& position, tTileSet
                                tTileSetCalibration& calibration) {
   tTileSet fresh_set;
   tTileSetCalibration fresh_calibration;
-  Long count = 0;
   FieldReader in(stream, position);
-  in.get_string(fresh_set.TSN).get_long(count);
-  if (!in.ok()) return false;
-  if (count < 1 || count > kMaxTileSetTiles) return false;
-  const auto needed =
-      static_cast<std::size_t>(count) * kMinTileSetTileBytes + kCalibrationHeaderBytes;
-  if (needed > bytes_from(stream, position)) return false;
+  StreamObserver* const observer = in.observer();
+  Long count = 0;
+  {
+    const ObservedRecord ts(observer, kTileSetArgument);
+    in.get<&tTileSet::TSN>(fresh_set);
+    const Long count_at = in.position();
+    in.get_long(count, stream_names::kTileCount);
+    if (!in.ok()) return false;
+    if (count < 1 || count > kMaxTileSetTiles) {
+      refuse(observer, count_at, stream_names::kTileCount, [&] {
+        return "a tile count from 1 to " + std::to_string(kMaxTileSetTiles) + "; found " +
+               std::to_string(count);
+      });
+      return false;
+    }
+    const auto needed =
+        static_cast<std::size_t>(count) * kMinTileSetTileBytes + kCalibrationHeaderBytes;
+    if (needed > bytes_from(stream, position)) {
+      refuse(observer, count_at, stream_names::kTileCount, [&] {
+        return "a tile count that fits: it says " + std::to_string(count) +
+               " tiles, which need at least " + std::to_string(needed) + " more bytes, but only " +
+               std::to_string(bytes_from(stream, position)) + " are left";
+      });
+      return false;
+    }
 
-  fresh_set.Tiles.redim(1, count);
-  fresh_calibration.Tiles.redim(1, count);
-  for (Long i = 1; i <= count && in.ok(); ++i) {
-    tTileDef& tile = fresh_set.Tiles(i);
-    in.get_string(tile.Name).get_long(tile.ColorRGB).get_spectrum(tile.TempComp);
+    fresh_set.Tiles.redim(1, count);
+    fresh_calibration.Tiles.redim(1, count);
+    for (Long i = 1; i <= count && in.ok(); ++i) {
+      const ObservedRecord element(observer, field_name<&tTileSet::Tiles>(), i);
+      tTileDef& tile = fresh_set.Tiles(i);
+      in.get<&tTileDef::Name>(tile).get<&tTileDef::ColorRGB>(tile).get<&tTileDef::TempComp>(tile);
+    }
   }
   fresh_calibration.TSN = fresh_set.TSN;
-  in.get_date(fresh_calibration.Certified).get_single(fresh_calibration.TempCalibrated);
-  for (Long i = 1; i <= count && in.ok(); ++i) in.get_sc_pair(fresh_calibration.Tiles(i));
+  {
+    const ObservedRecord tsc(observer, kCalibrationArgument);
+    in.get<&tTileSetCalibration::Certified>(fresh_calibration)
+        .get<&tTileSetCalibration::TempCalibrated>(fresh_calibration);
+    for (Long i = 1; i <= count && in.ok(); ++i) {
+      const ObservedRecord element(observer, field_name<&tTileSetCalibration::Tiles>(), i);
+      in.get_sc_pair(fresh_calibration.Tiles(i));
+    }
+  }
   if (!in.ok()) return false;
 
   set = std::move(fresh_set);
@@ -108,18 +141,37 @@ bool write_profile(const tOVProfile& profile, ByteArray& stream, Long& position)
 
 bool read_profile(const ByteArray& stream, Long& position, tOVProfile& profile) {
   FieldReader in(stream, position);
-  in.get_string(profile.ISN).get_date(profile.Created).get_boolean(profile.Validated);
+  StreamObserver* const observer = in.observer();
+  const ObservedRecord pro(observer, kProfileArgument);
+  in.get<&tOVProfile::ISN>(profile).get<&tOVProfile::Created>(profile).get<&tOVProfile::Validated>(
+      profile);
   String type_name;
-  in.get_string(type_name);
-  if (!in.ok() || type_name != kProfileDataTypeName) return false;
+  const Long name_at = in.position();
+  in.get_string(type_name, stream_names::kRecordName);
+  if (!in.ok()) return false;
+  if (type_name != kProfileDataTypeName) {
+    refuse(observer, name_at, stream_names::kRecordName, [&] {
+      return "the data record name \"" + to_utf8(kProfileDataTypeName) + "\"; found \"" +
+             to_utf8(type_name) + "\"";
+    });
+    return false;
+  }
 
   tOVProfileDataV1 tables;
-  for (Long k = 0; k <= 1; ++k) {
-    for (Long band = 1; band <= kBandCount; ++band) {
-      in.get_single(tables.wCal(k).Data(band))
-          .get_single(tables.wave(k).Data(band))
-          .get_single(tables.Linear(k).Data(band))
-          .get_single(tables.Dark(k).Data(band));
+  {
+    const ObservedRecord data(observer, field_name<&tOVProfile::ProfileData>());
+    for (const eSC sc : {eSC::SCE, eSC::SCI}) {
+      const std::string_view geometry = FieldReader::sc_name(sc);
+      for (Long band = 1; band <= kBandCount; ++band) {
+        in.get_single(tables.wCal(sc).Data(band), {field_name<&tOVProfileDataV1::wCal>(), geometry},
+                      band)
+            .get_single(tables.wave(sc).Data(band),
+                        {field_name<&tOVProfileDataV1::wave>(), geometry}, band)
+            .get_single(tables.Linear(sc).Data(band),
+                        {field_name<&tOVProfileDataV1::Linear>(), geometry}, band)
+            .get_single(tables.Dark(sc).Data(band),
+                        {field_name<&tOVProfileDataV1::Dark>(), geometry}, band);
+      }
     }
   }
   if (!in.ok()) return false;
@@ -136,10 +188,11 @@ bool write_station(const tStation& station, ByteArray& stream, Long& position) {
 }
 
 bool read_station(const ByteArray& stream, Long& position, tStation& station) {
-  return FieldReader(stream, position)
-      .get_string(station.StationGUID)
-      .get_string(station.StationName)
-      .get_string(station.StationMail)
+  FieldReader in(stream, position);
+  const ObservedRecord record(in.observer(), kStationArgument);
+  return in.get<&tStation::StationGUID>(station)
+      .get<&tStation::StationName>(station)
+      .get<&tStation::StationMail>(station)
       .ok();
 }
 

@@ -5,10 +5,14 @@
 
 #include <cstddef>
 #include <limits>
+#include <string>
+#include <string_view>
 #include <utility>
 
+#include "kvdata/foundation/record_fields.hpp"
 #include "streams/detail/field_cursor.hpp"
 #include "streams/detail/little_endian.hpp"
+#include "streams/detail/observe.hpp"
 #include "streams/detail/record_streams.hpp"
 
 namespace kvdata::detail {
@@ -28,11 +32,14 @@ void put_stats(FieldWriter& out, const tTestStats& stats) {
       .put_date(stats.TestEnd);
 }
 
-void get_stats(FieldReader& in, tTestStats& stats) {
+void get_stats(FieldReader& in, std::string_view name, tTestStats& stats) {
+  const ObservedRecord record(in.observer(), name);
   Long result = 0;
-  in.get_long(result);
+  in.get_long(result, field_name<&tTestStats::TestResult>());
   stats.TestResult = static_cast<eTestResult>(result);
-  in.get_string(stats.TestExplain).get_date(stats.TestStart).get_date(stats.TestEnd);
+  in.get<&tTestStats::TestExplain>(stats)
+      .get<&tTestStats::TestStart>(stats)
+      .get<&tTestStats::TestEnd>(stats);
 }
 
 // Per geometry and band, the trial value and the profiled value side by side.
@@ -43,10 +50,19 @@ void put_iia_tile(FieldWriter& out, const tIIATile& tile) {
   }
 }
 
+// Where the values of an IIA tile's spectra go, by geometry: Trial.SCE(band), ...
+constexpr FieldReader::Slot kTrialSlots[] = {
+    {field_name<&tIIATile::Trial>(), FieldReader::sc_name(eSC::SCE)},
+    {field_name<&tIIATile::Trial>(), FieldReader::sc_name(eSC::SCI)}};
+constexpr FieldReader::Slot kProfiledSlots[] = {
+    {field_name<&tIIATile::TrialProfiled>(), FieldReader::sc_name(eSC::SCE)},
+    {field_name<&tIIATile::TrialProfiled>(), FieldReader::sc_name(eSC::SCI)}};
+
 void get_iia_tile(FieldReader& in, tIIATile& tile) {
   FieldReader::Run values = in.run(kIiaTileBytes);
   for (Long k = 0; k <= 1; ++k) {
-    values.get_interleaved(tile.Trial.Spectrum(k).Data, tile.TrialProfiled.Spectrum(k).Data);
+    values.get_interleaved(tile.Trial.Spectrum(k).Data, tile.TrialProfiled.Spectrum(k).Data,
+                           kTrialSlots[k], kProfiledSlots[k]);
   }
 }
 
@@ -114,38 +130,64 @@ bool write_test_run(const tTestRun1& run, ByteArray& stream, Long& position) {
 bool read_test_run(const ByteArray& stream, Long& position, tTestRun1& run) {
   tTestRun1 fresh;
   FieldReader in(stream, position);
-  in.get_string(fresh.ISN)
-      .get_long(fresh.UserNumber)
-      .get_string(fresh.StationGUID)
-      .get_date(fresh.TestDate)
-      .get_string(fresh.Comment);
-  get_stats(in, fresh.Stats);
-  get_stats(in, fresh.CommunicationsTest);
-  get_stats(in, fresh.LightLevels.Stats);
-  tTUD_Repeatability& rep = fresh.Repeatability;
-  get_stats(in, rep.Stats);
-  in.get_spectrum(rep.BlueTileStdDev)
-      .get_single(rep.BlueTileMaxdE)
-      .get_single(rep.BlueTileDriftdE)
-      .get_single(rep.BlueTileRMSdE);
-  in.get_spectrum(rep.WhiteTileStdDev)
-      .get_single(rep.WhiteTileMaxdE)
-      .get_single(rep.WhiteTileDriftdE)
-      .get_single(rep.WhiteTileRMSdE);
+  StreamObserver* const observer = in.observer();
+  const ObservedRecord tr(observer, kTestRunArgument);
+  in.get<&tTestRun1::ISN>(fresh)
+      .get<&tTestRun1::UserNumber>(fresh)
+      .get<&tTestRun1::StationGUID>(fresh)
+      .get<&tTestRun1::TestDate>(fresh)
+      .get<&tTestRun1::Comment>(fresh);
+  get_stats(in, field_name<&tTestRun1::Stats>(), fresh.Stats);
+  get_stats(in, field_name<&tTestRun1::CommunicationsTest>(), fresh.CommunicationsTest);
+  {
+    const ObservedRecord light(observer, field_name<&tTestRun1::LightLevels>());
+    get_stats(in, field_name<&tTUD_LightLevels::Stats>(), fresh.LightLevels.Stats);
+  }
+  {
+    tTUD_Repeatability& rep = fresh.Repeatability;
+    const ObservedRecord repeatability(observer, field_name<&tTestRun1::Repeatability>());
+    get_stats(in, field_name<&tTUD_Repeatability::Stats>(), rep.Stats);
+    in.get<&tTUD_Repeatability::BlueTileStdDev>(rep)
+        .get<&tTUD_Repeatability::BlueTileMaxdE>(rep)
+        .get<&tTUD_Repeatability::BlueTileDriftdE>(rep)
+        .get<&tTUD_Repeatability::BlueTileRMSdE>(rep);
+    in.get<&tTUD_Repeatability::WhiteTileStdDev>(rep)
+        .get<&tTUD_Repeatability::WhiteTileMaxdE>(rep)
+        .get<&tTUD_Repeatability::WhiteTileDriftdE>(rep)
+        .get<&tTUD_Repeatability::WhiteTileRMSdE>(rep);
+  }
   tTUD_IIA& iia = fresh.IIA;
-  get_stats(in, iia.Stats);
-  in.get_date(iia.CalStandard).get_string(iia.TSN).get_boolean(iia.Has2Measurement);
+  const ObservedRecord iia_record(observer, field_name<&tTestRun1::IIA>());
+  get_stats(in, field_name<&tTUD_IIA::Stats>(), iia.Stats);
+  in.get<&tTUD_IIA::CalStandard>(iia).get<&tTUD_IIA::TSN>(iia).get<&tTUD_IIA::Has2Measurement>(iia);
 
   for (Long m = 1; m <= series_count(iia) && in.ok(); ++m) {
     tIIATileSet& series = iia.Measurements(m);
+    const ObservedRecord measurement(observer, field_name<&tTUD_IIA::Measurements>(), m);
     Integer count = 0;
-    in.get_date(series.Profile).get_integer(count);
+    in.get<&tIIATileSet::Profile>(series);
+    const Long count_at = in.position();
+    in.get_integer(count, stream_names::kTileCount);
     if (!in.ok()) return false;
     if (count <= 0) continue;  // a series without tiles has no bounds
     const auto needed = static_cast<std::size_t>(count) * kIiaTileBytes;
-    if (needed > bytes_from(stream, position)) return false;
+    if (needed > bytes_from(stream, position)) {
+      refuse(observer, count_at, stream_names::kTileCount, [&] {
+        return "a tile count that fits: it says " + std::to_string(count) + " tiles of " +
+               std::to_string(kIiaTileBytes) + " bytes each (" + std::to_string(needed) +
+               " bytes), but only " + std::to_string(bytes_from(stream, position)) + " are left";
+      });
+      return false;
+    }
     series.Tiles.redim(1, count);
-    for (Long i = 1; i <= count && in.ok(); ++i) get_iia_tile(in, series.Tiles(i));
+    for (Long i = 1; i <= count && in.ok(); ++i) {
+      if (observer == nullptr) {
+        get_iia_tile(in, series.Tiles(i));
+      } else {
+        const ObservedRecord tile(observer, field_name<&tIIATileSet::Tiles>(), i);
+        get_iia_tile(in, series.Tiles(i));
+      }
+    }
   }
   if (!in.ok()) return false;
 

@@ -1,25 +1,26 @@
 #include "objects/detail/tile_block.hpp"
 
-#include "objects/detail/record_image.hpp"
+#include <cassert>
+
+#include "kvdata/streams/stream_observer.hpp"
 
 namespace kvdata::detail {
 
-void encode_tile(const tTileDef& def, std::span<Byte, kTileBlockBytes> block) {
-  set_text_field(block, kTileNameOffset, kTileNameUnits, def.Name);
-  set_field<Long>(block, kTileColorRGBOffset, def.ColorRGB);
-  for (Long band = 1; band <= kBandCount; ++band) {
-    set_field<Single>(block, tile_band_offset(band), def.TempComp.Data(band));
-  }
+void encode_tile(const tTileDef& def, std::span<Byte, kTileBlockBytes> block, Long position) {
+  [[maybe_unused]] const bool inside =
+      store_fields(def, kTileLayout.cells, block, stream_observer(), position);
+  assert(inside);
 }
 
 tTileDef decode_tile(std::span<const Byte, kTileBlockBytes> block) {
   tTileDef def;
-  def.Name = get_text_field(block, kTileNameOffset, kTileNameUnits);
-  def.ColorRGB = get_field<Long>(block, kTileColorRGBOffset);
-  for (Long band = 1; band <= kBandCount; ++band) {
-    def.TempComp.Data(band) = get_field<Single>(block, tile_band_offset(band));
-  }
+  [[maybe_unused]] const bool inside = load_fields(block, kTileLayout.cells, def);
+  assert(inside);
   return def;
+}
+
+bool observe_tile(StreamObserver& observer, std::span<const Byte> present, Long position) {
+  return observe_block(observer, kTileLayout.cells, present, position);
 }
 
 }  // namespace kvdata::detail

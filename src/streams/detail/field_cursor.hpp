@@ -7,18 +7,24 @@
 // per remaining value.
 //
 //   kvdata::detail::FieldReader in(bytes, pos);
-//   in.get_string(station.StationGUID).get_string(station.StationName);
+//   in.get_string(station.StationGUID, "StationGUID").get_string(station.StationName, ...);
 //   if (!in.ok()) return false;
 
 #include <cstddef>
 #include <optional>
 #include <span>
+#include <string>
+#include <string_view>
+#include <type_traits>
 
 #include "kvdata/automation/array.hpp"
 #include "kvdata/automation/types.hpp"
+#include "kvdata/foundation/record_fields.hpp"
 #include "kvdata/foundation/records.hpp"
+#include "kvdata/streams/stream_observer.hpp"
 #include "streams/detail/checked_codec.hpp"
 #include "streams/detail/little_endian.hpp"
+#include "streams/detail/observe.hpp"
 
 namespace kvdata::detail {
 
@@ -118,43 +124,49 @@ class FieldWriter {
 };
 
 // Each get_ stores its value straight into the target as soon as that value
-// is read; a value that fails leaves its target as the codec leaves it.
+// is read; a value that fails leaves its target as the codec leaves it. Each
+// names its field (the record's field name, or what the bytes are); while an
+// observer is installed, every value read is reported to it under that name
+// and the first failure is refused there with what was expected.
 class FieldReader {
  public:
+  // The path of a value inside the record being read: `field(index)` inside
+  // `record` (empty: directly in the record entered last).
+  struct Slot {
+    std::string_view record;
+    std::string_view field;
+  };
+
   // A run of Single values known in advance to take `bytes` bytes: when all
-  // of them lie inside the array they are read straight from it; otherwise
-  // each value goes through the codec, so that the values before the
-  // failing one are stored and the failing one logs its entry as usual. The
+  // of them lie inside the array (and nobody observes the reader) they are
+  // read straight from it; otherwise each value goes through the codec, so
+  // that the values before the failing one are stored, the failing one logs
+  // its entry as usual, and an observer sees them value by value. The
   // caller reads exactly `bytes` bytes through the run before using the
   // reader again.
   class Run {
    public:
-    Run& get_single(Single& v) {
-      if (block_) {
-        static_cast<void>(load_le(*block_, offset_, v));
-        offset_ += kWireWidth<Single>;
-      } else {
-        in_.get_single(v);
-      }
-      return *this;
-    }
-
-    Run& get_singles(std::span<Single> values) {
+    // values[0] .. values[n - 1] as name(1) .. name(n).
+    Run& get_singles(std::span<Single> values, std::string_view name) {
       if (block_) {
         static_cast<void>(load_le_run(*block_, offset_, values));
         offset_ += kWireWidth<Single> * values.size();
       } else {
-        for (Single& v : values) in_.get_single(v);
+        const Slot slot{{}, name};
+        in_.ok_ =
+            in_.ok_ && read_each(in_.stream_, in_.position_, in_.observer_, values, {}, slot, slot);
       }
       return *this;
     }
     // a[0], b[0], a[1], b[1], ...; `a` and `b` have the same length.
-    Run& get_interleaved(std::span<Single> a, std::span<Single> b) {
+    Run& get_interleaved(std::span<Single> a, std::span<Single> b, const Slot& a_slot,
+                         const Slot& b_slot) {
       if (block_) {
         static_cast<void>(load_le_interleaved(*block_, offset_, a, b));
         offset_ += 2 * kWireWidth<Single> * a.size();
       } else {
-        for (std::size_t i = 0; i < a.size(); ++i) in_.get_single(a[i]).get_single(b[i]);
+        in_.ok_ =
+            in_.ok_ && read_each(in_.stream_, in_.position_, in_.observer_, a, b, a_slot, b_slot);
       }
       return *this;
     }
@@ -167,44 +179,183 @@ class FieldReader {
     std::size_t offset_ = 0;
   };
 
-  FieldReader(const ByteArray& stream, Long& position) : stream_(stream), position_(position) {}
+  FieldReader(const ByteArray& stream, Long& position)
+      : stream_(stream), position_(position), observer_(stream_observer()) {}
 
   Run run(std::size_t bytes) {
     std::optional<std::span<const Byte>> block;
-    if (ok_) block = checked::peek_run(stream_, position_, bytes);
+    if (ok_ && observer_ == nullptr) block = checked::peek_run(stream_, position_, bytes);
     if (block) position_ += static_cast<Long>(bytes);
     return Run(*this, block);
   }
 
-  FieldReader& get_integer(Integer& v) { return step(checked::read_integer, v); }
-  FieldReader& get_long(Long& v) { return step(checked::read_long, v); }
-  FieldReader& get_single(Single& v) { return step(checked::read_single, v); }
-  FieldReader& get_date(Date& v) { return step(checked::read_date, v); }
-  FieldReader& get_boolean(bool& v) { return step(checked::read_boolean, v); }
-  FieldReader& get_string(String& v) { return step(checked::read_string, v); }
+  FieldReader& get_integer(Integer& v, std::string_view name) {
+    return step(checked::read_integer, v, name);
+  }
+  FieldReader& get_long(Long& v, std::string_view name) {
+    return step(checked::read_long, v, name);
+  }
+  FieldReader& get_single(Single& v, std::string_view name) {
+    return step(checked::read_single, v, name);
+  }
+  FieldReader& get_date(Date& v, std::string_view name) {
+    return step(checked::read_date, v, name);
+  }
+  FieldReader& get_boolean(bool& v, std::string_view name) {
+    return step(checked::read_boolean, v, name);
+  }
+  FieldReader& get_string(String& v, std::string_view name) {
+    return step(checked::read_string, v, name);
+  }
+  // Element `index` of a fixed array of Singles.
+  FieldReader& get_single(Single& v, std::string_view name, Long index) {
+    return step(checked::read_single, v, name, index);
+  }
+  FieldReader& get_single(Single& v, const Slot& slot, Long index) {
+    if (observer_ == nullptr || slot.record.empty()) return get_single(v, slot.field, index);
+    const ObservedRecord inside(observer_, slot.record);
+    return get_single(v, slot.field, index);
+  }
 
-  FieldReader& get_spectrum(tSpectrum& s) {
-    run(kSpectrumBytes).get_singles(s.Data);
+  // The field `Member` of `record`, under its described name:
+  // in.get<&tStation::StationGUID>(station).
+  template <auto Member, class R>
+  FieldReader& get(R& record) {
+    constexpr std::string_view name = field_name<Member>();
+    auto& v = record.*Member;
+    using V = std::remove_cvref_t<decltype(v)>;
+    if constexpr (std::is_same_v<V, String>) {
+      return get_string(v, name);
+    } else if constexpr (std::is_same_v<V, Long>) {
+      return get_long(v, name);
+    } else if constexpr (std::is_same_v<V, Integer>) {
+      return get_integer(v, name);
+    } else if constexpr (std::is_same_v<V, Single>) {
+      return get_single(v, name);
+    } else if constexpr (std::is_same_v<V, Date>) {
+      return get_date(v, name);
+    } else if constexpr (std::is_same_v<V, bool>) {
+      return get_boolean(v, name);
+    } else {
+      static_assert(std::is_same_v<V, tSpectrum>, "a field the codec does not read");
+      return get_spectrum(v, name);
+    }
+  }
+
+  // 40 Single values, band 1 first, as name(1) .. name(40).
+  FieldReader& get_spectrum(tSpectrum& s, std::string_view name) {
+    run(kSpectrumBytes).get_singles(s.Data, name);
     return *this;
   }
+  // Spectrum(SCE) then Spectrum(SCI), each named by its geometry: SCE(1) ..
+  // SCE(40), SCI(1) .. SCI(40).
   FieldReader& get_sc_pair(tSCPair& p) {
     Run values = run(2 * kSpectrumBytes);
-    for (tSpectrum& s : p.Spectrum) values.get_singles(s.Data);
+    for (const eSC sc : {eSC::SCE, eSC::SCI}) values.get_singles(p.Spectrum(sc).Data, sc_name(sc));
     return *this;
   }
 
   // True while every value so far was read.
   bool ok() const { return ok_; }
+  Long position() const { return position_; }
+  // The observer watching this reader, or nullptr.
+  StreamObserver* observer() const { return observer_; }
+
+  // "SCE", "SCI".
+  static constexpr std::string_view sc_name(eSC sc) { return sc == eSC::SCE ? kSCEName : kSCIName; }
 
  private:
   template <class F, class V>
-  FieldReader& step(F read, V& v) {
-    ok_ = ok_ && read(stream_, position_, v);
+  FieldReader& step(F read, V& v, std::string_view name, std::optional<Long> index = {}) {
+    if (observer_ != nullptr) [[unlikely]] {
+      ok_ = ok_ && observed_step(read, stream_, position_, v, *observer_, name, index);
+    } else {
+      ok_ = ok_ && read(stream_, position_, v);
+    }
     return *this;
   }
 
+  // The step while someone watches: the value read is reported, or the
+  // failure refused with what was expected. Static, so that the reader
+  // itself never leaves the caller's registers on the path nobody watches.
+  template <class F, class V>
+  [[gnu::noinline, gnu::cold]] static bool observed_step(F read, const ByteArray& stream,
+                                                         Long& position, V& v,
+                                                         StreamObserver& observer,
+                                                         std::string_view name,
+                                                         std::optional<Long> index) {
+    const Long start = position;
+    if (!read(stream, position, v)) {
+      refuse(
+          &observer, start, name, [&] { return expected_at<V>(stream, start); }, index);
+      return false;
+    }
+    FieldValue value;
+    if constexpr (std::is_same_v<V, String>) {
+      value = std::u16string_view(v);
+    } else {
+      value = v;
+    }
+    report(&observer, name, start, position - start, value, index);
+    return true;
+  }
+
+  // The values of a run one by one: a[0], b[0], a[1], b[1], ... (only `a`
+  // when `b` is empty), each at its index from 1 in its slot, observed or
+  // not. False at the first that fails.
+  [[gnu::noinline]] static bool read_each(const ByteArray& stream, Long& position,
+                                          StreamObserver* observer, std::span<Single> a,
+                                          std::span<Single> b, const Slot& a_slot,
+                                          const Slot& b_slot) {
+    const auto one = [&](Single& v, const Slot& slot, std::size_t i) {
+      if (observer == nullptr) return checked::read_single(stream, position, v);
+      const auto index = static_cast<Long>(i + 1);
+      if (slot.record.empty()) {
+        return observed_step(checked::read_single, stream, position, v, *observer, slot.field,
+                             index);
+      }
+      const ObservedRecord inside(observer, slot.record);
+      return observed_step(checked::read_single, stream, position, v, *observer, slot.field, index);
+    };
+    for (std::size_t i = 0; i < a.size(); ++i) {
+      if (!one(a[i], a_slot, i)) return false;
+      if (!b.empty() && !one(b[i], b_slot, i)) return false;
+    }
+    return true;
+  }
+
+  // What a value of type V needed at `start`, where it failed.
+  template <class V>
+  static std::string expected_at(const ByteArray& stream, Long start) {
+    const std::size_t left = bytes_from(stream, start);
+    if constexpr (std::is_same_v<V, String>) {
+      Long count = 0;
+      if (!load_le(stream, start, count)) {
+        return "a String count (Long): " + shortfall(kWireWidth<Long>, left);
+      }
+      if (count < 0) return "a String count of 0 or more; found " + std::to_string(count);
+      return "a String count that fits: it says " + std::to_string(count) +
+             " bytes of text follow, but only " + std::to_string(left - kWireWidth<Long>) +
+             " are left";
+    } else if constexpr (std::is_same_v<V, bool>) {
+      return "a Boolean: " + shortfall(1, left);
+    } else if constexpr (std::is_same_v<V, Integer>) {
+      return "an Integer: " + shortfall(kWireWidth<V>, left);
+    } else if constexpr (std::is_same_v<V, Long>) {
+      return "a Long: " + shortfall(kWireWidth<V>, left);
+    } else if constexpr (std::is_same_v<V, Single>) {
+      return "a Single: " + shortfall(kWireWidth<V>, left);
+    } else {
+      return "a Date: " + shortfall(kWireWidth<V>, left);
+    }
+  }
+
+  static constexpr std::string_view kSCEName = *member_name(eSC::SCE);
+  static constexpr std::string_view kSCIName = *member_name(eSC::SCI);
+
   const ByteArray& stream_;
   Long& position_;
+  StreamObserver* observer_;
   bool ok_ = true;
 };
 

@@ -8,6 +8,7 @@
 //   ok = kvdata::detail::read_station(bytes, pos, station);
 
 #include <cstddef>
+#include <string_view>
 
 #include "kvdata/automation/array.hpp"
 #include "kvdata/automation/types.hpp"
@@ -18,6 +19,17 @@ namespace kvdata::detail {
 // Sizes of the two fixed-size record blocks.
 inline constexpr std::size_t kUserStreamBlockBytes = 261;
 inline constexpr std::size_t kOrganizationBlockBytes = 133;
+
+// The argument names of the Stream_ operations. Each reader enters the
+// record it reads under the name of its argument, as a caller sees it.
+inline constexpr std::string_view kSCPairArgument = "SCP";
+inline constexpr std::string_view kTileSetArgument = "TS";
+inline constexpr std::string_view kCalibrationArgument = "TSC";
+inline constexpr std::string_view kProfileArgument = "pro";
+inline constexpr std::string_view kStationArgument = "Station";
+inline constexpr std::string_view kTestRunArgument = "TR";
+inline constexpr std::string_view kUserArgument = "User";
+inline constexpr std::string_view kOrganizationArgument = "Org";
 
 // Largest tile count of the tile-set stream (its tile counter is 8-bit).
 inline constexpr Long kMaxTileSetTiles = 254;

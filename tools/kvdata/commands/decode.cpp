@@ -8,8 +8,7 @@
 #include "support/files.hpp"
 #include "support/output_file.hpp"
 #include "wire/codec.hpp"
-#include "wire/explain_render.hpp"
-#include "wire/layouts.hpp"
+#include "wire/stream_walk.hpp"
 
 namespace kvdata::cli {
 namespace {
@@ -18,17 +17,6 @@ struct DecodeOptions {
   std::vector<std::string> args;
   std::string output;
 };
-
-// The field of the walk that holds byte `offset`, for messages.
-std::string field_at(const Walk& walk, std::size_t offset) {
-  for (const FieldRow& r : walk.rows) {
-    if (offset >= r.offset && offset < r.offset + r.width) {
-      return r.name + " (offset " + std::to_string(r.offset) + ", " + std::to_string(r.width) +
-             " bytes)";
-    }
-  }
-  return "offset " + std::to_string(offset);
-}
 
 // Warns when encoding the decoded document would not give the same bytes:
 // the state written out is what the document holds, so its bytes are those
@@ -58,8 +46,7 @@ void check_round_trip(StreamState& state, std::span<const Byte> bytes, const std
     what = "the last " + std::to_string(bytes.size() - again.size()) +
            " bytes are not part of the decoded stream";
   } else {
-    const Walk walk = walk_layout(kind, bytes);
-    what = "the bytes differ from " + field_at(walk, at) + " on";
+    what = "the bytes differ from " + field_at(kind, bytes, at) + " on";
   }
   std::cerr << "kvdata: warning: " << file
             << ": encoding this JSON will not give back the same bytes: " << what
@@ -76,8 +63,7 @@ void run_decode(const DecodeOptions& o) {
     state = decode_stream(kind, stream);
   } catch (const InputError& e) {
     std::string message = file + ": " + e.what();
-    const Walk walk = walk_layout(kind, bytes);
-    if (walk.problem) message += ".\n" + verdict(walk, bytes.size());
+    if (const auto problem = stream_problem(kind, bytes)) message += ".\n" + *problem;
     message += "\nkvdata explain " + std::string(kind_name(kind)) + " " + file +
                " shows the stream field by field.";
     bad_input(message);

@@ -5,8 +5,8 @@
 #include "commands/stream_args.hpp"
 #include "support/errors.hpp"
 #include "support/files.hpp"
+#include "support/output_file.hpp"
 #include "wire/explain_render.hpp"
-#include "wire/layouts.hpp"
 
 namespace kvdata::cli {
 namespace {
@@ -19,12 +19,12 @@ struct ExplainOptions {
 
 void run_explain(const ExplainOptions& o) {
   const auto [given, file] = kind_and_file(o.args);
-  const std::vector<Byte> bytes = read_bytes(file);
+  const ByteArray bytes = read_byte_array(file);
   const StreamKind kind = resolve_kind(given, bytes, file, "explain");
-  const Walk walk = walk_layout(kind, bytes);
-  write_output(o.output, o.json ? render_walk_json(walk, bytes).dump(2) + "\n"
-                                : render_walk_table(walk, bytes));
-  if (walk.problem) bad_input(file + ": " + verdict(walk, bytes.size()));
+  OutputFile out(o.output);
+  const WalkEnd end = o.json ? explain_json(kind, bytes, out) : explain_table(kind, bytes, out);
+  out.commit();
+  if (end.problem) bad_input(file + ": " + verdict(kind, end, bytes.size()));
 }
 
 }  // namespace

@@ -1,5 +1,6 @@
 #include "commands/stream_args.hpp"
 
+#include <algorithm>
 #include <iostream>
 
 #include "support/errors.hpp"
@@ -20,7 +21,16 @@ KindAndFile kind_and_file(const std::vector<std::string>& args) {
 
 StreamKind resolve_kind(std::optional<StreamKind> kind, std::span<const Byte> bytes,
                         const std::string& file, const std::string& command) {
-  if (bytes.empty()) bad_input(file + ": is empty; there is no stream to read");
+  if (kind && !bytes.empty()) return *kind;
+  ByteArray a(0, static_cast<Long>(bytes.size()) - 1);
+  std::copy(bytes.begin(), bytes.end(), a.begin());
+  return resolve_kind(kind, a, file, command);
+}
+
+StreamKind resolve_kind(std::optional<StreamKind> kind, const ByteArray& bytes,
+                        const std::string& file, const std::string& command) {
+  if (!bytes.has_bounds() || bytes.size() == 0)
+    bad_input(file + ": is empty; there is no stream to read");
   if (kind) return *kind;
   const Identification id = identify(bytes);
   if (!id.kind) {

@@ -10,6 +10,7 @@
 #include <string>
 #include <vector>
 
+#include "kvdata/automation/array.hpp"
 #include "kvdata/automation/types.hpp"
 #include "wire/stream_kind.hpp"
 
@@ -29,6 +30,8 @@ StreamKind require_kind(const std::string& word);
 // `kind` when given; otherwise the identified kind, announced on standard
 // error. When the stream cannot be told, a UsageError asks for KIND; an empty
 // file is an InputError either way.
+StreamKind resolve_kind(std::optional<StreamKind> kind, const ByteArray& bytes,
+                        const std::string& file, const std::string& command);
 StreamKind resolve_kind(std::optional<StreamKind> kind, std::span<const Byte> bytes,
                         const std::string& file, const std::string& command);
 

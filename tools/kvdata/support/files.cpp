@@ -9,6 +9,7 @@
 #include <cstdio>
 #include <cstring>
 #include <iostream>
+#include <limits>
 
 #include "support/errors.hpp"
 #include "support/output_file.hpp"
@@ -69,27 +70,22 @@ std::vector<Byte> read_bytes(const std::string& path) {
 
 ByteArray read_byte_array(const std::string& path) {
   InputFile file(path);
-  std::size_t room = std::max<std::size_t>(file.size(), 1);
-  ByteArray a(0, static_cast<Long>(room) - 1);
-  std::size_t n = 0;
+  ByteArray bytes(0, -1);
+  // One more than the file's size, so that the read that finds the end
+  // needs no growth.
+  bytes.reserve(file.size() + 1);
+  char buf[1 << 16];
   for (;;) {
-    if (n == room) {
-      // Full: the file may have grown since its size was taken.
-      char probe[1 << 12];
-      const std::size_t more = file.read(probe, sizeof probe);
-      if (more == 0) break;
-      room = std::max(2 * room, n + more);
-      a.redim_preserve(0, static_cast<Long>(room) - 1);
-      std::copy(probe, probe + more, a.data() + n);
-      n += more;
-      continue;
+    const std::size_t n = file.read(buf, sizeof buf);
+    if (n == 0) break;
+    const Long at = bytes.ubound() + 1;
+    if (n > static_cast<std::size_t>(std::numeric_limits<Long>::max() - at)) {
+      bad_input(path + ": is too large for a stream");
     }
-    const std::size_t got = file.read(reinterpret_cast<char*>(a.data() + n), room - n);
-    if (got == 0) break;
-    n += got;
+    bytes.redim_preserve(0, at + static_cast<Long>(n) - 1);
+    std::memcpy(bytes.data() + at, buf, n);
   }
-  a.redim_preserve(0, static_cast<Long>(n) - 1);
-  return a;
+  return bytes;
 }
 
 std::string read_text(const std::string& path) {

@@ -19,8 +19,8 @@ namespace kvdata::cli {
 
 // The file's bytes. A missing or unreadable file raises InputError naming it.
 std::vector<Byte> read_bytes(const std::string& path);
-// The file's bytes read straight into a library byte array with indices
-// 0..n-1 (an empty file: 0..-1). Same failures as read_bytes.
+// The file's bytes as a stream with indices 0..n-1, read straight into the
+// array. Same failures as read_bytes.
 ByteArray read_byte_array(const std::string& path);
 // The file's text, as bytes. Same failures as read_bytes.
 std::string read_text(const std::string& path);

@@ -122,6 +122,7 @@ class RecordState final : public StreamState {
       Long pos = 0;
       LibraryLog log;
       const bool ok = call(eStreamDirection::ToStream, bytes, pos);
+      check.verify();
       const bool out_of_room = pos > bytes.ubound();
       if (!ok && (!out_of_room || size > (std::size_t{1} << 30))) {
         refused(kind(), "writer refused the record", {}, log);
@@ -264,8 +265,12 @@ std::shared_ptr<Class> make_object(PropertyValues<Class>& values, const std::str
     if constexpr (MembersProperty<P>) {
       Long i = 1;
       for (auto& member_values : value) {
+        // A watching observer (the width check) hears the member's texts under its path.
+        StreamObserver* const watching = stream_observer();
+        if (watching != nullptr) watching->enter(p.name, i);
         const std::string item = element(at, i++);
         auto member = make_object<typename P::member_class>(member_values, item, kind);
+        if (watching != nullptr) watching->leave();
         try {
           p.add(o, member);
         } catch (const Error& e) {
@@ -365,7 +370,9 @@ class ObjectState final : public StreamState {
     bytes.reserve(room);
     Long pos = 0;
     LibraryLog log;
-    if (!static_cast<IKVStream&>(*object).StreamOut(bytes, pos)) {
+    const bool ok = static_cast<IKVStream&>(*object).StreamOut(bytes, pos);
+    check.verify();
+    if (!ok) {
       refused(kind(), "writer refused the object", {}, log);
     }
     return bytes;

@@ -1,77 +1,260 @@
 #include "wire/explain_render.hpp"
 
+#include <cmath>
 #include <cstdio>
+#include <string_view>
+#include <variant>
 
-#include "support/text_table.hpp"
+#include "json/dates.hpp"
+#include "json/json.hpp"
+#include "json/numbers.hpp"
+#include "kvdata/automation/text.hpp"
+#include "kvdata/foundation/record_fields.hpp"
 
 namespace kvdata::cli {
+namespace {
+
+template <class... F>
+struct Overloaded : F... {
+  using F::operator()...;
+};
+template <class... F>
+Overloaded(F...) -> Overloaded<F...>;
+
+std::span<const Byte> whole(const ByteArray& bytes) {
+  if (!bytes.has_bounds()) return {};
+  return {bytes.data(), bytes.size()};
+}
+
+// Shortest text that reads back, or the JSON form of a value JSON cannot hold.
+std::string show_single(Single v) {
+  if (std::isfinite(v)) return shortest_text(v);
+  return single_to_json(v).get<std::string>();
+}
+std::string show_double(Double v) {
+  if (std::isfinite(v)) return shortest_text(v);
+  return double_to_json(v).get<std::string>();
+}
+
+// A fixed-width text: quoted with JSON escapes; trailing blank padding and
+// never-set (all U+0000) fields are described instead of shown.
+std::string show_fixed_text(std::u16string_view s) {
+  if (s.empty()) return "\"\"";
+  bool never_set = true;
+  for (char16_t c : s) never_set = never_set && c == 0;
+  if (never_set) return "never set (" + std::to_string(s.size()) + " x U+0000)";
+  std::size_t end = s.size();
+  while (end > 0 && s[end - 1] == u' ') --end;
+  std::string shown = Json(to_utf8(s.substr(0, end))).dump();
+  if (end < s.size()) shown += " + " + std::to_string(s.size() - end) + " blanks";
+  return shown;
+}
+
+// "#RRGGBB" of a ColorRGB value (red in the low byte); "" when not a colour.
+std::string show_colour(Long rgb) {
+  if (rgb < 0 || rgb > 0xFFFFFF) return "";
+  char buf[16];
+  std::snprintf(buf, sizeof buf, "#%02X%02X%02X", static_cast<unsigned>(rgb & 0xFF),
+                static_cast<unsigned>((rgb >> 8) & 0xFF),
+                static_cast<unsigned>((rgb >> 16) & 0xFF));
+  return buf;
+}
+
+std::string show_long(const StreamField& f, Long v) {
+  std::string shown = std::to_string(v);
+  if (f.name == field_name<&tTileDef::ColorRGB>()) {
+    const std::string colour = show_colour(v);
+    if (!colour.empty()) shown += " (" + colour + ")";
+  } else if (f.name == field_name<&tTestStats::TestResult>()) {
+    const auto member = member_name(static_cast<eTestResult>(v));
+    shown += member ? " (" + std::string(*member) + ")" : " (not a member of eTestResult)";
+  }
+  return shown;
+}
+
+std::string show_filler(std::string_view name) {
+  if (name == stream_names::kTrailingByte) return "written as 0, dropped on reading";
+  if (name == stream_names::kSpareByte) return "left by the writer after the encoding; not read";
+  return "written as 0, not read";
+}
+
+// Characters in the decimal form of n.
+std::size_t digits(std::size_t n) {
+  return std::to_string(n).size();
+}
+
+void pad(std::string& line, std::string_view cell, std::size_t width, bool right) {
+  if (right) line.append(width > cell.size() ? width - cell.size() : 0, ' ');
+  line += cell;
+  if (!right) line.append(width > cell.size() ? width - cell.size() : 0, ' ');
+}
+
+struct Columns {
+  std::size_t offset, width, bytes, field;
+};
+
+// Offset, width, bytes, field and value, without trailing blanks.
+std::string table_row(const Columns& c, std::string_view offset, std::string_view width,
+                      std::string_view bytes, std::string_view field, std::string_view value) {
+  std::string line;
+  pad(line, offset, c.offset, true);
+  line += "  ";
+  pad(line, width, c.width, true);
+  line += "  ";
+  pad(line, bytes, c.bytes, false);
+  line += "  ";
+  pad(line, field, c.field, false);
+  line += "  ";
+  line += value;
+  while (!line.empty() && line.back() == ' ') line.pop_back();
+  line += '\n';
+  return line;
+}
+
+class LongestPath : public WalkSink {
+ public:
+  void field(std::string_view path, const StreamField&) override {
+    longest = std::max(longest, path.size());
+  }
+  std::size_t longest = 0;
+};
+
+class TableRows : public WalkSink {
+ public:
+  TableRows(const Columns& columns, std::span<const Byte> stream, OutputFile& out)
+      : columns_(columns), stream_(stream), out_(out) {}
+  void field(std::string_view path, const StreamField& f) override {
+    const auto at = static_cast<std::size_t>(f.position);
+    const auto width = static_cast<std::size_t>(f.width);
+    out_.write(table_row(columns_, std::to_string(at), std::to_string(width),
+                         hex_bytes(stream_.subspan(at, width)), path, value_text(f, stream_)));
+  }
+
+ private:
+  const Columns& columns_;
+  std::span<const Byte> stream_;
+  OutputFile& out_;
+};
+
+class JsonRows : public WalkSink {
+ public:
+  JsonRows(std::span<const Byte> stream, OutputFile& out) : stream_(stream), out_(out) {}
+  void field(std::string_view path, const StreamField& f) override {
+    const auto at = static_cast<std::size_t>(f.position);
+    const auto width = static_cast<std::size_t>(f.width);
+    Json row = Json::object();
+    row["offset"] = at;
+    row["width"] = width;
+    row["bytes"] = hex_bytes(stream_.subspan(at, width), width);
+    row["field"] = path;
+    row["value"] = value_text(f, stream_);
+    out_.write(first_ ? "\n    " : ",\n    ");
+    out_.write(row.dump());
+    first_ = false;
+  }
+
+ private:
+  std::span<const Byte> stream_;
+  OutputFile& out_;
+  bool first_ = true;
+};
+
+}  // namespace
 
 std::string hex_bytes(std::span<const Byte> bytes, std::size_t limit) {
+  static constexpr char kDigits[] = "0123456789ABCDEF";
   std::string out;
-  char buf[4];
-  for (std::size_t i = 0; i < bytes.size() && i < limit; ++i) {
-    std::snprintf(buf, sizeof buf, "%02X", bytes[i]);
-    if (!out.empty()) out += ' ';
-    out += buf;
+  const std::size_t shown = std::min(bytes.size(), limit);
+  out.reserve(3 * shown);
+  for (std::size_t i = 0; i < shown; ++i) {
+    if (i > 0) out += ' ';
+    out += kDigits[bytes[i] >> 4];
+    out += kDigits[bytes[i] & 0xF];
   }
   if (bytes.size() > limit) out += " +" + std::to_string(bytes.size() - limit);
   return out;
 }
 
-std::string verdict(const Walk& walk, std::size_t size) {
-  const std::string kind(kind_name(walk.kind));
-  if (!walk.problem) {
-    return "The whole stream reads as " + kind + " (" + std::to_string(size) + " bytes).";
-  }
-  return "Stops at offset " + std::to_string(walk.problem->offset) + ", " + walk.problem->field +
-         ": expected " + walk.problem->expected + ".";
+std::string value_text(const StreamField& f, std::span<const Byte> stream) {
+  return std::visit(Overloaded{
+                        [&](std::monostate) { return show_filler(f.name); },
+                        [](Byte v) { return std::to_string(v); },
+                        [](Integer v) { return std::to_string(v); },
+                        [&](Long v) { return show_long(f, v); },
+                        [](Single v) { return show_single(v); },
+                        [](Double v) { return show_double(v); },
+                        [](Date d) {
+                          std::string shown = show_double(d.days) + " days";
+                          if (auto iso = iso_text(d)) shown = *iso + " (" + shown + ")";
+                          return shown;
+                        },
+                        [&](bool v) {
+                          std::string shown = v ? "True" : "False";
+                          const auto at = static_cast<std::size_t>(f.position);
+                          if (at < stream.size() && stream[at] > 1) {
+                            shown +=
+                                " (byte " + std::to_string(stream[at]) + "; only 1 reads as True)";
+                          }
+                          return shown;
+                        },
+                        [&](std::u16string_view text) {
+                          return f.units > 0 ? show_fixed_text(text) : Json(to_utf8(text)).dump();
+                        },
+                    },
+                    f.value);
 }
 
-std::string render_walk_table(const Walk& walk, std::span<const Byte> bytes) {
-  TextTable table({{"offset", Align::Right},
-                   {"width", Align::Right},
-                   {"bytes", Align::Left},
-                   {"field", Align::Left},
-                   {"value", Align::Left}});
-  for (const FieldRow& r : walk.rows) {
-    table.add_row({std::to_string(r.offset), r.width == 0 ? "" : std::to_string(r.width),
-                   hex_bytes(bytes.subspan(r.offset, r.width)), r.name, r.value});
+WalkEnd explain_table(StreamKind kind, const ByteArray& bytes, OutputFile& out) {
+  const std::span<const Byte> stream = whole(bytes);
+  LongestPath longest;
+  static_cast<void>(walk_stream(kind, bytes, longest));
+  const std::size_t size_digits = digits(stream.size());
+  // A walk that stops names the field where it stops: a path no longer than
+  // the longest one walked, or a description of what follows the encoding.
+  const Columns columns{std::max<std::size_t>(size_digits, 6),
+                        std::max<std::size_t>(size_digits, 5),
+                        std::max<std::size_t>(23 + 2 + size_digits, 5),
+                        std::max({longest.longest, stream_names::kEndOfStream.size(),
+                                  stream_names::kSpareByte.size()})};
+
+  out.write(std::string(kind_name(kind)) + " stream, " + std::to_string(stream.size()) +
+            " bytes\n\n");
+  out.write(table_row(columns, "offset", "width", "bytes", "field", "value"));
+  TableRows rows(columns, stream, out);
+  const WalkEnd end = walk_stream(kind, bytes, rows);
+  if (end.problem) {
+    const std::size_t at = std::min(end.problem->offset, stream.size());
+    out.write(
+        table_row(columns, std::to_string(at), "",
+                  hex_bytes(stream.subspan(at).first(std::min<std::size_t>(stream.size() - at, 8))),
+                  end.problem->field, "<-- stops here"));
   }
-  if (walk.problem) {
-    const std::size_t at = walk.problem->offset;
-    const std::size_t shown = std::min<std::size_t>(bytes.size() - at, 8);
-    table.add_row({std::to_string(at), "", hex_bytes(bytes.subspan(at, shown)), walk.problem->field,
-                   "<-- stops here"});
-  }
-  return std::string(kind_name(walk.kind)) + " stream, " + std::to_string(bytes.size()) +
-         " bytes\n\n" + table.render() + "\n" + verdict(walk, bytes.size()) + "\n";
+  // Appended piece by piece (GCC 12 warns falsely about "\n" + text at -O3).
+  std::string tail(1, '\n');
+  tail += verdict(kind, end, stream.size());
+  tail += '\n';
+  out.write(tail);
+  return end;
 }
 
-Json render_walk_json(const Walk& walk, std::span<const Byte> bytes) {
-  Json out = Json::object();
-  out["kind"] = std::string(kind_name(walk.kind));
-  out["size"] = bytes.size();
-  Json fields = Json::array();
-  for (const FieldRow& r : walk.rows) {
-    Json f = Json::object();
-    f["offset"] = r.offset;
-    f["width"] = r.width;
-    f["bytes"] = hex_bytes(bytes.subspan(r.offset, r.width), r.width);
-    f["field"] = r.name;
-    f["value"] = r.value;
-    fields.push_back(std::move(f));
-  }
-  out["fields"] = std::move(fields);
-  if (walk.problem) {
+WalkEnd explain_json(StreamKind kind, const ByteArray& bytes, OutputFile& out) {
+  const std::span<const Byte> stream = whole(bytes);
+  out.write("{\n  \"kind\": " + Json(std::string(kind_name(kind))).dump() +
+            ",\n  \"size\": " + std::to_string(stream.size()) + ",\n  \"fields\": [");
+  JsonRows rows(stream, out);
+  const WalkEnd end = walk_stream(kind, bytes, rows);
+  out.write("\n  ],\n  \"problem\": ");
+  if (end.problem) {
     Json p = Json::object();
-    p["offset"] = walk.problem->offset;
-    p["field"] = walk.problem->field;
-    p["expected"] = walk.problem->expected;
-    out["problem"] = std::move(p);
+    p["offset"] = end.problem->offset;
+    p["field"] = end.problem->field;
+    p["expected"] = end.problem->expected;
+    out.write(p.dump());
   } else {
-    out["problem"] = nullptr;
+    out.write("null");
   }
-  return out;
+  out.write("\n}\n");
+  return end;
 }
 
 }  // namespace kvdata::cli

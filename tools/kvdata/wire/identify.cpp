@@ -3,45 +3,123 @@
 #include <algorithm>
 #include <vector>
 
-#include "wire/layouts.hpp"
+#include "json/numbers.hpp"
+#include "kvdata/foundation/record_fields.hpp"
+#include "kvdata/objects/kv_test_run.hpp"
+#include "wire/stream_walk.hpp"
 
 namespace kvdata::cli {
+namespace {
 
-Identification identify(std::span<const Byte> bytes) {
-  std::vector<Walk> fits;
-  std::optional<Walk> closest;
+// How strongly a kind that fits says the bytes are of that kind.
+enum class Evidence {
+  Length = 0,        // a fixed-size block: any bytes of that length fit
+  Structure = 1,     // counts and texts fill the bytes exactly
+  Stamp = 2,         // a version stamp matched
+  StampAndName = 3,  // a version stamp and a record name matched
+};
+
+// Keeps the Single the reader took first, at offset 0: the version stamp of
+// the kinds that have one.
+class FirstSingle : public WalkSink {
+ public:
+  void field(std::string_view, const StreamField& f) override {
+    if (f.position != 0) return;
+    if (const auto* v = std::get_if<Single>(&f.value)) stamp = *v;
+  }
+  std::optional<Single> stamp;
+};
+
+struct Fit {
+  StreamKind kind;
+  Evidence evidence;
+  std::string text;
+};
+
+std::string length_text(std::size_t n) {
+  return "its length of " + std::to_string(n) + " bytes";
+}
+
+std::string record_name() {
+  return "the record name \"" + std::string(RecordDescription<tOVProfileDataV1>::kName) + "\"";
+}
+
+// What the reader's success says; `stamp` is the Single read at offset 0.
+Fit evidence(StreamKind kind, std::optional<Single> stamp, std::size_t size) {
+  const std::string stamp_text = stamp ? shortest_text(*stamp) : std::string("?");
+  switch (kind) {
+    case StreamKind::User:
+      return {kind, Evidence::Stamp, "the user version stamp " + stamp_text + " at offset 0"};
+    case StreamKind::Profile:
+      return {kind, Evidence::StampAndName,
+              "the profile version stamp " + stamp_text + " and " + record_name()};
+    case StreamKind::ProfileRecord:
+      return {kind, Evidence::StampAndName, record_name()};
+    case StreamKind::TestRun:
+      // The reader takes any version; only the one a new run writes is evidence.
+      if (stamp && *stamp == KVTestRun::create()->StreamVersion()) {
+        return {kind, Evidence::Stamp, "the test run version " + stamp_text + " at offset 0"};
+      }
+      return {kind, Evidence::Structure, "fields that fill the stream exactly"};
+    case StreamKind::TolSet:
+      return {kind, Evidence::Structure, "a member count that matches its length"};
+    case StreamKind::TileSet:
+      return {kind, Evidence::Structure, "a TSN followed by exactly 13 tile blocks"};
+    case StreamKind::TileSetCalibration:
+      return {kind, Evidence::Structure, "a tile count and texts that fill the stream exactly"};
+    case StreamKind::Station:
+      return {kind, Evidence::Structure, "three texts that fill the stream exactly"};
+    case StreamKind::TestRunRecord:
+      return {kind, Evidence::Structure, "fields that fill the stream exactly"};
+    case StreamKind::Tolerance:
+    case StreamKind::Tile:
+    case StreamKind::Calibration:
+    case StreamKind::SCPair:
+    case StreamKind::UserBlock:
+    case StreamKind::Organization:
+      break;
+  }
+  return {kind, Evidence::Length, length_text(size)};
+}
+
+}  // namespace
+
+Identification identify(const ByteArray& bytes) {
+  const std::size_t size = bytes.has_bounds() ? bytes.size() : 0;
+  std::vector<Fit> fits;
+  std::optional<std::pair<StreamKind, Problem>> closest;
   for (const KindInfo& k : all_kinds()) {
-    Walk w = walk_layout(k.kind, bytes);
-    if (!w.problem) {
-      fits.push_back(std::move(w));
-    } else if (!closest || w.problem->offset > closest->problem->offset) {
-      closest = std::move(w);
+    FirstSingle first;
+    WalkEnd end = walk_stream(k.kind, bytes, first);
+    if (!end.problem) {
+      fits.push_back(evidence(k.kind, first.stamp, size));
+    } else if (!closest || end.problem->offset > closest->second.offset) {
+      closest.emplace(k.kind, std::move(*end.problem));
     }
   }
   if (fits.empty()) {
-    std::string reason = "no kind of stream fits these " + std::to_string(bytes.size()) + " bytes";
+    std::string reason = "no kind of stream fits these " + std::to_string(size) + " bytes";
     if (closest) {
-      reason += "; the closest is " + std::string(kind_name(closest->kind)) +
-                ", which stops at offset " + std::to_string(closest->problem->offset) + " (" +
-                closest->problem->field + ": expected " + closest->problem->expected + ")";
+      reason += "; the closest is " + std::string(kind_name(closest->first)) +
+                ", which stops at offset " + std::to_string(closest->second.offset) + " (" +
+                closest->second.field + ": expected " + closest->second.expected + ")";
     }
     return {std::nullopt, reason};
   }
   std::stable_sort(fits.begin(), fits.end(),
-                   [](const Walk& a, const Walk& b) { return a.evidence > b.evidence; });
+                   [](const Fit& a, const Fit& b) { return a.evidence > b.evidence; });
   const bool unique = fits.size() == 1 || fits[0].evidence > fits[1].evidence;
   if (unique) {
-    std::string reason = "identified as a " + std::string(kind_name(fits[0].kind)) +
-                         " stream from " + fits[0].evidence_text;
-    return {fits[0].kind, reason};
+    return {fits[0].kind, "identified as a " + std::string(kind_name(fits[0].kind)) +
+                              " stream from " + fits[0].text};
   }
   std::string names;
-  for (const Walk& w : fits) {
-    if (w.evidence != fits[0].evidence) break;
+  for (const Fit& f : fits) {
+    if (f.evidence != fits[0].evidence) break;
     if (!names.empty()) names += ", ";
-    names += kind_name(w.kind);
+    names += kind_name(f.kind);
   }
-  return {std::nullopt, "these " + std::to_string(bytes.size()) +
+  return {std::nullopt, "these " + std::to_string(size) +
                             " bytes fit more than one kind of stream (" + names + ")"};
 }
 

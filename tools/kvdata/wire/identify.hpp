@@ -1,17 +1,17 @@
 #pragma once
 // Tells which kind of stream a file holds from what can be checked without
 // being told: version stamps, the profile's record name, counts that fill
-// the bytes exactly, and exact lengths. Each kind's layout walk is tried; a
-// kind fits when its walk reads the whole stream without a problem.
+// the bytes exactly, and exact lengths. The library's reader of each kind
+// is tried (stream_walk.hpp); a kind fits when its reader takes the whole
+// stream and the end-of-stream rules hold.
 //
 //   Identification id = identify(bytes);
 //   if (id.kind) std::cerr << id.reason;  else std::cerr << id.reason;  // asks for KIND
 
 #include <optional>
-#include <span>
 #include <string>
 
-#include "kvdata/automation/types.hpp"
+#include "kvdata/automation/array.hpp"
 #include "wire/stream_kind.hpp"
 
 namespace kvdata::cli {
@@ -21,6 +21,6 @@ struct Identification {
   std::string reason;              // what was concluded and why, or why no kind can be told
 };
 
-Identification identify(std::span<const Byte> bytes);
+Identification identify(const ByteArray& bytes);
 
 }  // namespace kvdata::cli

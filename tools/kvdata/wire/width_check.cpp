@@ -1,36 +1,30 @@
 #include "wire/width_check.hpp"
 
-#include <variant>
+#include <string>
 
-#include "json/fields.hpp"
 #include "support/errors.hpp"
 
 namespace kvdata::cli {
-namespace {
-
-std::string step(std::string_view name, std::optional<Long> index) {
-  return index ? element(name, *index) : std::string(name);
-}
-
-}  // namespace
 
 void WidthCheck::enter(std::string_view name, std::optional<Long> index) {
-  path_.push_back(step(name, index));
+  path_.enter(name, index);
 }
 
 void WidthCheck::leave() {
-  if (!path_.empty()) path_.pop_back();
+  path_.leave();
 }
 
 void WidthCheck::field(const StreamField& f) {
+  if (f.units == 0) return;
   const auto* text = std::get_if<std::u16string_view>(&f.value);
-  if (f.units == 0 || text == nullptr || text->size() <= f.units) return;
-  std::string path;
-  for (const std::string& s : path_) path += s + ".";
-  path += step(f.name, f.index);
-  bad_input(path + ": " + std::to_string(text->size()) +
-            " UTF-16 code units, but the field holds " + std::to_string(f.units) +
-            "; the library would cut the text");
+  if (problem_ || text == nullptr || text->size() <= f.units) return;
+  problem_ = std::string(path_.of(f.name, f.index)) + ": " + std::to_string(text->size()) +
+             " characters, but the field holds " + std::to_string(f.units) +
+             "; the library would cut the text";
+}
+
+void WidthCheck::verify() const {
+  if (problem_) bad_input(*problem_);
 }
 
 }  // namespace kvdata::cli
