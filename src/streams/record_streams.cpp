@@ -2,6 +2,7 @@
 // profile and station.
 
 #include <cstddef>
+#include <span>
 #include <string>
 #include <string_view>
 #include <utility>
@@ -18,6 +19,25 @@ namespace {
 
 // Type name of the profile tables, carried in the profile stream.
 constexpr std::u16string_view kProfileDataTypeName = RecordTraits<tOVProfileDataV1>::kTypeName;
+
+// Where the interleaved values of the profile tables go, by geometry (SCE,
+// SCI) and table: wCal.SCE(band), wave.SCE(band), ...
+constexpr FieldReader::Slot table_slot(Long sc, std::string_view table) {
+  return {table, FieldReader::sc_name(sc == 0 ? eSC::SCE : eSC::SCI)};
+}
+constexpr FieldReader::Slot kTableSlots[2][4] = {
+    {table_slot(0, field_name<&tOVProfileDataV1::wCal>()),
+     table_slot(0, field_name<&tOVProfileDataV1::wave>()),
+     table_slot(0, field_name<&tOVProfileDataV1::Linear>()),
+     table_slot(0, field_name<&tOVProfileDataV1::Dark>())},
+    {table_slot(1, field_name<&tOVProfileDataV1::wCal>()),
+     table_slot(1, field_name<&tOVProfileDataV1::wave>()),
+     table_slot(1, field_name<&tOVProfileDataV1::Linear>()),
+     table_slot(1, field_name<&tOVProfileDataV1::Dark>())}};
+
+// The four tables, both geometries, 40 bands each.
+constexpr std::size_t kTableBytes = 4 * 2 * kSpectrumBytes;
+static_assert(kTableBytes == 1280);
 
 // Fewest bytes a tile of the tile-set stream can take: an empty Name (its
 // count), ColorRGB, TempComp, and its certified pair of spectra.
@@ -160,18 +180,11 @@ bool read_profile(const ByteArray& stream, Long& position, tOVProfile& profile) 
   tOVProfileDataV1 tables;
   {
     const ObservedRecord data(observer, field_name<&tOVProfile::ProfileData>());
-    for (const eSC sc : {eSC::SCE, eSC::SCI}) {
-      const std::string_view geometry = FieldReader::sc_name(sc);
-      for (Long band = 1; band <= kBandCount; ++band) {
-        in.get_single(tables.wCal(sc).Data(band), {field_name<&tOVProfileDataV1::wCal>(), geometry},
-                      band)
-            .get_single(tables.wave(sc).Data(band),
-                        {field_name<&tOVProfileDataV1::wave>(), geometry}, band)
-            .get_single(tables.Linear(sc).Data(band),
-                        {field_name<&tOVProfileDataV1::Linear>(), geometry}, band)
-            .get_single(tables.Dark(sc).Data(band),
-                        {field_name<&tOVProfileDataV1::Dark>(), geometry}, band);
-      }
+    FieldReader::Run values = in.run(kTableBytes);
+    for (Long k = 0; k <= 1; ++k) {
+      const std::span<Single> arrays[] = {tables.wCal(k).Data, tables.wave(k).Data,
+                                          tables.Linear(k).Data, tables.Dark(k).Data};
+      values.get_side_by_side(arrays, kTableSlots[k]);
     }
   }
   if (!in.ok()) return false;

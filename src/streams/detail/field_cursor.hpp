@@ -153,8 +153,9 @@ class FieldReader {
         offset_ += kWireWidth<Single> * values.size();
       } else {
         const Slot slot{{}, name};
+        const std::span<Single> arrays[] = {values};
         in_.ok_ =
-            in_.ok_ && read_each(in_.stream_, in_.position_, in_.observer_, values, {}, slot, slot);
+            in_.ok_ && read_each(in_.stream_, in_.position_, in_.observer_, arrays, {&slot, 1});
       }
       return *this;
     }
@@ -165,8 +166,25 @@ class FieldReader {
         static_cast<void>(load_le_interleaved(*block_, offset_, a, b));
         offset_ += 2 * kWireWidth<Single> * a.size();
       } else {
-        in_.ok_ =
-            in_.ok_ && read_each(in_.stream_, in_.position_, in_.observer_, a, b, a_slot, b_slot);
+        const std::span<Single> arrays[] = {a, b};
+        const Slot slots[] = {a_slot, b_slot};
+        in_.ok_ = in_.ok_ && read_each(in_.stream_, in_.position_, in_.observer_, arrays, slots);
+      }
+      return *this;
+    }
+    // arrays[0][0], arrays[1][0], ..., arrays[0][1], arrays[1][1], ...: the
+    // values of arrays of one length side by side, each in its slot.
+    Run& get_side_by_side(std::span<const std::span<Single>> arrays, std::span<const Slot> slots) {
+      if (block_) {
+        const std::size_t n = arrays.empty() ? 0 : arrays[0].size();
+        for (std::size_t i = 0; i < n; ++i) {
+          for (const std::span<Single>& values : arrays) {
+            static_cast<void>(load_le(*block_, offset_, values[i]));
+            offset_ += kWireWidth<Single>;
+          }
+        }
+      } else {
+        in_.ok_ = in_.ok_ && read_each(in_.stream_, in_.position_, in_.observer_, arrays, slots);
       }
       return *this;
     }
@@ -300,26 +318,28 @@ class FieldReader {
     return true;
   }
 
-  // The values of a run one by one: a[0], b[0], a[1], b[1], ... (only `a`
-  // when `b` is empty), each at its index from 1 in its slot, observed or
-  // not. False at the first that fails.
+  // The values of a run one by one, side by side as get_side_by_side takes
+  // them, each at its index from 1 in its slot, observed or not. False at
+  // the first that fails.
   [[gnu::noinline]] static bool read_each(const ByteArray& stream, Long& position,
-                                          StreamObserver* observer, std::span<Single> a,
-                                          std::span<Single> b, const Slot& a_slot,
-                                          const Slot& b_slot) {
-    const auto one = [&](Single& v, const Slot& slot, std::size_t i) {
-      if (observer == nullptr) return checked::read_single(stream, position, v);
-      const auto index = static_cast<Long>(i + 1);
-      if (slot.record.empty()) {
-        return observed_step(checked::read_single, stream, position, v, *observer, slot.field,
-                             index);
+                                          StreamObserver* observer,
+                                          std::span<const std::span<Single>> arrays,
+                                          std::span<const Slot> slots) {
+    const std::size_t n = arrays.empty() ? 0 : arrays[0].size();
+    for (std::size_t i = 0; i < n; ++i) {
+      for (std::size_t j = 0; j < arrays.size(); ++j) {
+        Single& v = arrays[j][i];
+        bool ok = false;
+        if (observer == nullptr) {
+          ok = checked::read_single(stream, position, v);
+        } else {
+          const Slot& slot = slots[j];
+          const ObservedRecord inside(slot.record.empty() ? nullptr : observer, slot.record);
+          ok = observed_step(checked::read_single, stream, position, v, *observer, slot.field,
+                             static_cast<Long>(i + 1));
+        }
+        if (!ok) return false;
       }
-      const ObservedRecord inside(observer, slot.record);
-      return observed_step(checked::read_single, stream, position, v, *observer, slot.field, index);
-    };
-    for (std::size_t i = 0; i < a.size(); ++i) {
-      if (!one(a[i], a_slot, i)) return false;
-      if (!b.empty() && !one(b[i], b_slot, i)) return false;
     }
     return true;
   }
