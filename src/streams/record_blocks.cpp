@@ -104,12 +104,17 @@ bool write_user_block(const tUser& user, ByteArray& stream, Long& position) {
   const ObservedRecord record(observer, kUserArgument);
   std::array<Byte, kUserImage.bytes> image{};
   const std::span<Byte> out(image);
-  // Disabled (the last cell) does not travel: it is stored unreported.
+  // The whole cells are reported as they are stored; of RoleCode only the
+  // low byte travels, so it is reported with the one byte it takes (a
+  // watcher can tell a unit above U+00FF would be lost); Disabled does not
+  // travel and is stored unreported.
   const std::span<const Cell> cells(kUserImage.cells);
-  if (!store_fields(user, cells.first(cells.size() - 1), out, observer, position) ||
-      !store_fields(user, cells.last(1), out)) {
+  if (!store_fields(user, kUserWholeCells, out, observer, position) ||
+      !store_fields(user, cells.subspan(kUserWholeCells.size()), out)) {
     return false;
   }
+  report(observer, kRoleCode.name, position + static_cast<Long>(kRoleCode.offset), 1,
+         std::u16string_view(user.RoleCode), std::nullopt, kRoleCode.count);
   return copy_out(out.first(kUserStreamBlockBytes), stream, position);
 }
 
