@@ -2,9 +2,11 @@
 
 #include <gtest/gtest.h>
 
+#include <functional>
 #include <iterator>
 #include <limits>
 #include <utility>
+#include <vector>
 
 #include "support/error_number.hpp"
 
@@ -15,40 +17,57 @@ namespace {
 
 using testing::error_number;
 
-TEST(Array, WithoutBoundsEveryQueryRaisesNine) {
-  Array<Long> a;
-  EXPECT_EQ(a.rank(), 0);
-  EXPECT_EQ(error_number([&] { (void)a.lbound(); }), kSubscriptOutOfRange);
-  EXPECT_EQ(error_number([&] { (void)a.ubound(); }), kSubscriptOutOfRange);
-  EXPECT_EQ(error_number([&] { (void)a(0); }), kSubscriptOutOfRange);
+constexpr Long kMax = std::numeric_limits<Long>::max();
+constexpr Long kMin = std::numeric_limits<Long>::min();
 
-  // Dimensioned with no elements is not the same as never dimensioned.
-  Array<Long> empty(0, -1);
-  EXPECT_EQ(empty.rank(), 1);
-  EXPECT_EQ(empty.ubound(), -1);
-  EXPECT_EQ(empty.size(), 0u);
-  EXPECT_FALSE(empty == a);
+TEST(Array, RefusedIndexesAndSizesRaiseTheirNumbers) {
+  const Array<Long> none;
+  const Array<Single> a(1, 40);
+  const Array<Single> t({{1, 2}, {1, 3}});
+  Array<Single> table({{1, 2}, {1, 3}});
+  const FixedArray<Single, 0, 1> pair;
+  const FixedArray<Long, 1, 40> bands;
+  const struct {
+    const char* what;
+    std::function<void()> f;
+    Long error;
+  } cases[] = {
+      {"lbound without bounds", [&] { (void)none.lbound(); }, kSubscriptOutOfRange},
+      {"ubound without bounds", [&] { (void)none.ubound(); }, kSubscriptOutOfRange},
+      {"element without bounds", [&] { (void)none(0); }, kSubscriptOutOfRange},
+      {"below lbound", [&] { (void)a(0); }, kSubscriptOutOfRange},
+      {"above ubound", [&] { (void)a(41); }, kSubscriptOutOfRange},
+      {"two indexes for one", [&] { (void)a(1, 1); }, kSubscriptOutOfRange},
+      {"no second dimension", [&] { (void)a.lbound(2); }, kSubscriptOutOfRange},
+      {"upper below lower", [] { Array<Byte> bad(5, 3); }, kSubscriptOutOfRange},
+      {"first index of two", [&] { (void)t(3, 1); }, kSubscriptOutOfRange},
+      {"second index of two", [&] { (void)t(1, 4); }, kSubscriptOutOfRange},
+      {"one index for two", [&] { (void)t(1); }, kSubscriptOutOfRange},
+      {"fixed above", [&] { (void)pair(2); }, kSubscriptOutOfRange},
+      {"fixed below", [&] { (void)bands(0); }, kSubscriptOutOfRange},
+      {"preserve of two dimensions", [&] { table.redim_preserve(1, 6); }, kSubscriptOutOfRange},
+      {"2^31 elements of two dimensions",
+       [&] {
+         table.redim({0, 65535}, {0, 32768});
+       },
+       kOutOfMemory},
+      {"every Long", [] { ByteArray all(kMin, kMax); }, kOutOfMemory},
+  };
+  for (const auto& c : cases) EXPECT_EQ(error_number(c.f), c.error) << c.what;
+  // Refused before anything changed.
+  EXPECT_EQ(table.rank(), 2);
+  EXPECT_EQ(table.ubound(2), 3);
 }
 
-TEST(Array, OwnIndexRangesAreCheckedOnBothSides) {
+TEST(Array, LayoutKeepsTheFirstIndexFastest) {
   Array<Single> a(1, 40);
-  EXPECT_EQ(a.lbound(), 1);
-  EXPECT_EQ(a.ubound(), 40);
   EXPECT_EQ(a(1), 0.0f);
   a(40) = 2.5f;
   EXPECT_EQ(a.data()[39], 2.5f);
-  EXPECT_EQ(error_number([&] { (void)a(0); }), kSubscriptOutOfRange);
-  EXPECT_EQ(error_number([&] { (void)a(41); }), kSubscriptOutOfRange);
-  EXPECT_EQ(error_number([&] { (void)a(1, 1); }), kSubscriptOutOfRange);  // wrong rank
-  EXPECT_EQ(error_number([&] { (void)a.lbound(2); }), kSubscriptOutOfRange);
-  EXPECT_EQ(error_number([] { Array<Byte> bad(5, 3); }), kSubscriptOutOfRange);
-
   Array<Long> negative(-3, -1);
   negative(-3) = 7;
   EXPECT_EQ(negative.data()[0], 7);
-}
 
-TEST(Array, TwoDimensionsKeepTheFirstIndexFastest) {
   Array<Single> t({{1, 2}, {1, 3}});
   EXPECT_EQ(t.rank(), 2);
   EXPECT_EQ(t.lbound(2), 1);
@@ -57,41 +76,43 @@ TEST(Array, TwoDimensionsKeepTheFirstIndexFastest) {
   t(1, 3) = 6.0f;
   EXPECT_EQ(t.data()[1], 5.0f);
   EXPECT_EQ(t.data()[4], 6.0f);
-  EXPECT_EQ(error_number([&] { (void)t(3, 1); }), kSubscriptOutOfRange);
-  EXPECT_EQ(error_number([&] { (void)t(1, 4); }), kSubscriptOutOfRange);
-  EXPECT_EQ(error_number([&] { (void)t(1); }), kSubscriptOutOfRange);
+
+  FixedArray<Single, 0, 1> pair;
+  pair(eSC::SCI) = 3.0f;
+  EXPECT_EQ(pair(1), 3.0f);
+  EXPECT_EQ((FixedArray<Long, 1, 40>{}.size()), 40u);
+
+  // Dimensioned with no elements is not the same as never dimensioned.
+  Array<Long> empty(0, -1);
+  EXPECT_EQ(empty.rank(), 1);
+  EXPECT_EQ(empty.size(), 0u);
+  EXPECT_FALSE(empty == Array<Long>());
 }
 
-TEST(Array, RedimDiscardsAndRedimPreserveKeepsWhatStaysInside) {
+// One array through a run of redims: its bounds and every element after each.
+TEST(Array, RedimPreserveKeepsWhatStaysInsideAndZeroesTheRest) {
   ByteArray a(1, 4);
   for (Long i = 1; i <= 4; ++i) a(i) = static_cast<Byte>(i);
-
-  a.redim_preserve(1, 6);  // lower bound kept, new elements zero
-  EXPECT_EQ(a.lbound(), 1);
-  EXPECT_EQ(a.ubound(), 6);
-  EXPECT_EQ(a(4), 4);
-  EXPECT_EQ(a(6), 0);
-
-  a.redim_preserve(1, 2);  // cut
-  EXPECT_EQ(a.ubound(), 2);
-  EXPECT_EQ(a(2), 2);
-  a.redim_preserve(1, 3);  // regrown element comes back zero, not the old 3
-  EXPECT_EQ(a(3), 0);
-
-  a.redim_preserve(0, 3);  // lower bound moved: elements keep their indices
-  EXPECT_EQ(a(0), 0);
-  EXPECT_EQ(a(1), 1);
-  EXPECT_EQ(a(2), 2);
-
+  const struct {
+    Long lower, upper;
+    std::vector<Byte> after;
+  } steps[] = {
+      {1, 6, {1, 2, 3, 4, 0, 0}},
+      {1, 2, {1, 2}},
+      {1, 3, {1, 2, 0}},     // the regrown element is zero, not the old 3
+      {0, 3, {0, 1, 2, 0}},  // a moved lower bound: elements keep their indices
+  };
+  for (const auto& s : steps) {
+    a.redim_preserve(s.lower, s.upper);
+    EXPECT_EQ(a.lbound(), s.lower);
+    EXPECT_EQ(std::vector<Byte>(a.begin(), a.end()), s.after) << s.lower << ".." << s.upper;
+  }
   a.redim(0, 1);
   EXPECT_EQ(a(1), 0);
-
-  ByteArray fresh;  // an array without bounds gets them
-  fresh.redim_preserve(0, 0);
-  EXPECT_EQ(fresh.ubound(), 0);
-
   a.erase();
   EXPECT_EQ(a.rank(), 0);
+  a.redim_preserve(0, 0);  // an array without bounds gets them
+  EXPECT_EQ(a.ubound(), 0);
 }
 
 TEST(Array, GrowingOneElementAtATimeReallocatesOnlyLogarithmicallyOften) {
@@ -158,8 +179,6 @@ TEST(Array, SpareElementsStayOutsideTheBoundsAndComeBackZero) {
 // keeps its value (index i holds the low byte of i), every new one is zero,
 // and a refused request leaves the array as it was.
 TEST(Array, RedimPreserveIsExactAtTheEdgesOfLong) {
-  constexpr Long kMax = std::numeric_limits<Long>::max();
-  constexpr Long kMin = std::numeric_limits<Long>::min();
   struct Case {
     Bounds from;
     Bounds to;
@@ -194,15 +213,6 @@ TEST(Array, RedimPreserveIsExactAtTheEdgesOfLong) {
       EXPECT_EQ(a(static_cast<Long>(i)), kept ? static_cast<Byte>(i) : 0) << i;
     }
   }
-
-  // Refused before anything is allocated: a two-dimensional preserve, and
-  // sizes beyond what an array may hold.
-  Array<Single> table({{1, 2}, {1, 3}});
-  EXPECT_EQ(error_number([&] { table.redim_preserve(1, 6); }), kSubscriptOutOfRange);
-  EXPECT_EQ(table.rank(), 2);
-  EXPECT_EQ(error_number([&] { table.redim({0, 65535}, {0, 32768}); }), kOutOfMemory);
-  EXPECT_EQ(error_number([] { ByteArray all(kMin, kMax); }), kOutOfMemory);
-  EXPECT_EQ(table.ubound(2), 3);
 }
 
 TEST(Array, CopiesAreIndependentValues) {
@@ -217,16 +227,6 @@ TEST(Array, CopiesAreIndependentValues) {
   EXPECT_EQ(moved(0), u"y");
   EXPECT_EQ(b.rank(), 0);  // NOLINT(bugprone-use-after-move): the source is left without bounds
   EXPECT_EQ(b.size(), 0u);
-}
-
-TEST(FixedArray, CheckedAccessAcceptsEnumerations) {
-  FixedArray<Single, 0, 1> pair;
-  pair(eSC::SCI) = 3.0f;
-  EXPECT_EQ(pair(1), 3.0f);
-  EXPECT_EQ(error_number([&] { (void)pair(2); }), kSubscriptOutOfRange);
-  FixedArray<Long, 1, 40> bands;
-  EXPECT_EQ(bands.size(), 40u);
-  EXPECT_EQ(error_number([&] { (void)bands(0); }), kSubscriptOutOfRange);
 }
 
 }  // namespace

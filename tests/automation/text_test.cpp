@@ -3,7 +3,6 @@
 #include <vector>
 
 #include "kvdata/automation/ansi.hpp"
-#include "kvdata/automation/event_log.hpp"
 #include "kvdata/automation/text.hpp"
 
 namespace kvdata {
@@ -39,16 +38,6 @@ TEST(Text, TrimsBlanksOnlyAndFoldsCase) {
   EXPECT_TRUE(equal_ignore_case(u"\u00e9t\u00e9", u"\u00c9T\u00c9"));
   EXPECT_FALSE(equal_ignore_case(u"TestRun", u"TestRuns"));
   EXPECT_EQ(from_utf8(to_utf8(u"caf\u00e9 \U0001F600")), u"caf\u00e9 \U0001F600");
-}
-
-TEST(EventLog, SinkCollectsEntriesAndCanBeRestored) {
-  std::vector<String> seen;
-  auto previous = EventLog::SetSink([&](const String& t) { seen.push_back(t); });
-  EventLog::Write(u"first");
-  EventLog::Write(u"second");
-  auto mine = EventLog::SetSink(previous);
-  EXPECT_TRUE(static_cast<bool>(mine));
-  EXPECT_EQ(seen, (std::vector<String>{u"first", u"second"}));
 }
 
 }  // namespace

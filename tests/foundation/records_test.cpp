@@ -48,13 +48,5 @@ TEST(Records, FreshRecordsAreEmptyAndFixedArraysKeepTheirIndexRanges) {
   EXPECT_EQ(error_number([&] { (void)run.LightLevels.LightLevels(9); }), kSubscriptOutOfRange);
 }
 
-TEST(Records, EnumerationsHoldTheirTypeLibraryValues) {
-  EXPECT_EQ(static_cast<Long>(eAccessTypes::accessRead), 1);
-  EXPECT_EQ(static_cast<Long>(eTestResult::NA), 3);
-  EXPECT_EQ(static_cast<Long>(eAperture::VerySmall), 3);
-  EXPECT_EQ(static_cast<Long>(eDBProviders::ODBC), 3);
-  EXPECT_EQ(static_cast<Long>(eStreamDirection::FromStream), 1);
-}
-
 }  // namespace
 }  // namespace kvdata
