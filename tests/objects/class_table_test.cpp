@@ -69,6 +69,73 @@ TEST(ClassTable, EachNameGivesANewObjectOfItsOwnClass) {
   }
 }
 
+// What a new object of each class answers: its interfaces, its identity
+// (ObjType and Description; nullptr where it has no IKVObj), and that its
+// persistence does nothing and its rights are all refused.
+struct Identity {
+  std::u16string_view progid;
+  const char16_t* obj_type;
+  const char16_t* description;
+  bool stream;
+  bool db;
+  bool security;
+};
+
+const Identity kIdentities[] = {
+    {u"KVData.KVTile", nullptr, nullptr, true, false, false},
+    {u"KVData.KVUser", u"User", u"User", true, false, false},
+    {u"KVData.KVProfile", u"Profile", u"Profile", true, false, false},
+    {u"KVData.KVTolSet", u"TolSet", u"Tolerance Set", true, true, true},
+    {u"KVData.KVTestRun", u"TestRun", u"Test Run", true, true, true},
+    {u"KVData.KVTestRunTilesDE", u"TestRunTileDEs", u"Test Run Tiles Average DEs", false, true,
+     false},
+};
+
+TEST(ClassTable, InterfacesIdentityAndInertPersistenceAndRights) {
+  for (const Identity& c : kIdentities) {
+    SCOPED_TRACE(to_utf8(c.progid));
+    const auto obj = CreateObject(c.progid);
+    const auto id = query<IKVObj>(obj);
+    ASSERT_EQ(id != nullptr, c.obj_type != nullptr);
+    if (id) {
+      EXPECT_EQ(id->ObjType(), c.obj_type);
+      EXPECT_EQ(id->Description(), c.description);
+    }
+    const auto stream = query<IKVStream>(obj);
+    EXPECT_EQ(stream != nullptr, c.stream);
+    EXPECT_EQ(query<IKVProfile>(obj) != nullptr, c.progid == u"KVData.KVProfile");
+    const auto db = query<IKVDBObject>(obj);
+    ASSERT_EQ(db != nullptr, c.db);
+    if (db) {
+      ByteArray before(0, -1);
+      if (stream) {
+        ASSERT_TRUE(stream->StreamOut(before));
+      }
+      String key = u"SN-1";
+      const Variant date(Date{5.0});
+      EXPECT_FALSE(db->Retrieve(key, &date));
+      EXPECT_FALSE(db->AddNew());
+      EXPECT_FALSE(db->Update());
+      EXPECT_FALSE(db->Delete());
+      EXPECT_EQ(key, u"SN-1");
+      EXPECT_EQ(db->ErrMsg(), u"");
+      ByteArray after(0, -1);
+      if (stream) {
+        ASSERT_TRUE(stream->StreamOut(after));
+      }
+      EXPECT_EQ(after, before);
+    }
+    const auto sec = query<IKVSecurity>(obj);
+    ASSERT_EQ(sec != nullptr, c.security);
+    if (sec) {
+      EXPECT_EQ(sec->UserNumber(), 0);
+      sec->UserNumber(42);
+      EXPECT_EQ(sec->UserNumber(), 42);
+      EXPECT_FALSE(sec->CanRead() || sec->CanAdd() || sec->CanUpdate() || sec->CanDelete());
+    }
+  }
+}
+
 TEST(ClassTable, InterfacesFacadesAndOtherNamesCannotBeCreated) {
   for (std::u16string_view name :
        {u"IKVObj",         u"IKVStream",  u"IKVDBObject",  u"IKVSecurity",   u"IKVObjCreator",

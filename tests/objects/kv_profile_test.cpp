@@ -413,34 +413,14 @@ TEST(KVProfile, StreamLenIsWhatStreamOutWrites) {
   EXPECT_EQ(p->ISN(), u"ABC\u20AC");
 }
 
-TEST(KVProfile, IdentityValuesAndInterfaces) {
-  auto obj = CreateObject(u"KVData.KVProfile");
-  auto p = query<KVProfile>(obj);
-  ASSERT_NE(p, nullptr);
-  EXPECT_NE(query<IKVProfile>(obj), nullptr);
-  EXPECT_NE(query<IKVStream>(obj), nullptr);
-  EXPECT_NE(query<IKVObj>(obj), nullptr);
-  EXPECT_EQ(query<IKVDBObject>(obj), nullptr);
-  EXPECT_EQ(query<IKVSecurity>(obj), nullptr);
-
-  EXPECT_EQ(p->ObjType(), u"Profile");
-  EXPECT_EQ(p->Description(), u"Profile");
-  EXPECT_EQ(p->ID().type(), VarType::String);
-  EXPECT_EQ(p->ID().get<String>(), u"");
+TEST(KVProfile, IdentityFollowsTheRecord) {
+  auto p = KVProfile::create();
+  EXPECT_EQ(p->ID(), Variant(String(u"")));
   EXPECT_EQ(p->DateCreated().get<Date>(), Date{});
-  EXPECT_FALSE(p->Validated());
   p->ISN(u"X9");
   p->Created(Date{44000.75});
   EXPECT_EQ(p->ID().get<String>(), u"X9");
   EXPECT_EQ(p->DateCreated().get<Date>(), Date{44000.75});
-
-  // No relation between the wavelength Longs is required.
-  p->StartWL(730);
-  p->EndWl(380);
-  p->Interval(-10);
-  EXPECT_EQ(p->StartWL(), 730);
-  EXPECT_EQ(p->EndWl(), 380);
-  EXPECT_EQ(p->Interval(), -10);
 }
 
 }  // namespace

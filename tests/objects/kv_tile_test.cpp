@@ -198,16 +198,5 @@ TEST(KVTile, RoundTripKeepsTheReceiversOrder) {
   EXPECT_EQ(target->Order(), 9);
 }
 
-TEST(KVTile, CreatableByNameAndAnsweringOnlyItsInterfaces) {
-  auto obj = CreateObject(u"KVData.KVTile");
-  ASSERT_NE(std::dynamic_pointer_cast<KVTile>(obj), nullptr);
-  EXPECT_NE(query<IKVTile>(obj), nullptr);
-  EXPECT_NE(query<IKVStream>(obj), nullptr);
-  EXPECT_EQ(query<IKVObj>(obj), nullptr);
-  EXPECT_EQ(query<IKVDBObject>(obj), nullptr);
-  EXPECT_EQ(query<IKVSecurity>(obj), nullptr);
-  EXPECT_EQ(error_number([] { (void)CreateObject(u"KVData.IKVTile"); }), kCannotCreateObject);
-}
-
 }  // namespace
 }  // namespace kvdata

@@ -145,48 +145,6 @@ TEST(KVTolerance, StreamOutRaisesTheFailureWithItsStep) {
   EXPECT_EQ(untouched.ubound(), 9);
 }
 
-TEST(KVTolerance, StreamInNeedsAll749Bytes) {
-  ByteArray full;
-  ASSERT_TRUE(sample_tolerance()->StreamOut(full));
-
-  ByteArray exact(0, 748);  // 749 bytes: the encoding and nothing more
-  for (Long i = 0; i <= 748; ++i) exact(i) = full(i);
-  auto tol = KVTolerance::create();
-  Long pos = 0;
-  EXPECT_TRUE(tol->StreamIn(exact, pos));
-  EXPECT_EQ(pos, 749);
-  EXPECT_EQ(tol->MaxFail(), 2.0);
-
-  // One byte short: False, the record unchanged, Position past the bytes read.
-  ByteArray shorter(0, 747);
-  for (Long i = 0; i <= 747; ++i) shorter(i) = full(i);
-  auto other = KVTolerance::create();
-  other->ID(77);
-  pos = 0;
-  EXPECT_FALSE(other->StreamIn(shorter, pos));
-  EXPECT_EQ(pos, 748);
-  EXPECT_EQ(other->ID(), 77);
-  EXPECT_EQ(other->MaxFail(), 0.0);
-
-  // A Position before the array's first index reads nothing.
-  ByteArray from_file(1, 749);
-  pos = 0;
-  EXPECT_FALSE(other->StreamIn(from_file, pos));
-  EXPECT_EQ(pos, 0);
-  pos = -5;
-  EXPECT_FALSE(other->StreamIn(exact, pos));
-  EXPECT_EQ(pos, -5);
-
-  // No array, or a Position whose block would pass the Long range.
-  pos = 0;
-  EXPECT_FALSE(other->StreamIn(ByteArray(), pos));
-  EXPECT_EQ(pos, 0);
-  pos = std::numeric_limits<Long>::max() - 10;
-  EXPECT_FALSE(other->StreamIn(exact, pos));
-  EXPECT_EQ(pos, std::numeric_limits<Long>::max() - 10);
-  EXPECT_EQ(other->ID(), 77);
-}
-
 TEST(KVTolerance, TextFieldsAreCutPaddedAndTrimmed) {
   auto tol = KVTolerance::create();
   IKVTolerance& t = *tol;
