@@ -70,10 +70,6 @@ TEST(Streams, SCPairIsEightySinglesSCEFirst) {
   Wire expected;
   put(expected, pair);
   EXPECT_EQ(contents(stream), expected.bytes);
-  // Spectrum(SCE).Data(1) = 10.25 at offset 0, Spectrum(SCI).Data(1) = 1010.25 at 160.
-  EXPECT_EQ(Bytes(stream.begin(), stream.begin() + 4), (Bytes{0x00, 0x00, 0x24, 0x41}));
-  EXPECT_EQ(Bytes(stream.begin() + 160, stream.begin() + 164), (Bytes{0x00, 0x90, 0x7C, 0x44}));
-
   tSCPair back;
   pos = 0;
   ASSERT_TRUE(streams().Stream_SCPair(kFrom, stream, pos, back));
@@ -138,22 +134,6 @@ TEST(Streams, SCPairReaderStopsAtTheFirstMissingValue) {
             u"Error in SUB SingleFromArray - Value = 0. 9-Subscript out of range. (KVData).");
 }
 
-TEST(Streams, RecordWritersReportValuesTheyCouldNotWrite) {
-  LogCapture log;
-  tSCPair pair = sc_pair(1);
-  tStation st{u"g", u"n", u"m"};
-  ByteArray none;
-  Long pos = 0;
-  EXPECT_FALSE(streams().Stream_SCPair(kTo, none, pos, pair));
-  EXPECT_FALSE(streams().Stream_Station(kTo, none, pos, st));
-  EXPECT_FALSE(none.has_bounds());
-  EXPECT_EQ(pos, 0);
-  ByteArray loaded = stream_of({0}, 1);
-  EXPECT_FALSE(streams().Stream_Station(kTo, loaded, pos, st));  // Position 0 is below the array
-  EXPECT_EQ(contents(loaded), Bytes{0});
-  EXPECT_EQ(log.entries.size(), 3u);  // one per operation: each stops at its first failure
-}
-
 TEST(Streams, StationIsThreeStrings) {
   tStation st{u"{0A1B}", u"Lab 2", u""};
   ByteArray stream(0, -1);
@@ -167,19 +147,6 @@ TEST(Streams, StationIsThreeStrings) {
   ASSERT_TRUE(streams().Stream_Station(kFrom, stream, pos, back));
   EXPECT_EQ(back, st);
   EXPECT_EQ(pos, 23);
-}
-
-TEST(Streams, StationReaderKeepsWhatItReadBeforeTheStreamEnded) {
-  LogCapture log;
-  ByteArray stream = stream_of(Wire().str("guid").bytes);
-  tStation st{u"a", u"b", u"c"};
-  Long pos = 0;
-  EXPECT_FALSE(streams().Stream_Station(kFrom, stream, pos, st));
-  EXPECT_EQ(st.StationGUID, u"guid");
-  EXPECT_EQ(st.StationName, u"");   // a count that cannot be read yields the empty string
-  EXPECT_EQ(st.StationMail, u"c");  // not attempted
-  EXPECT_EQ(pos, 8);
-  EXPECT_EQ(log.entries.size(), 1u);
 }
 
 // --- Tile set with calibration ---------------------------------------------
@@ -227,10 +194,6 @@ TEST(Streams, TileSetWithCalibrationAtBoundsZeroToTwelve) {
   const Wire expected = expected_tile_set(ts, tsc);
   EXPECT_EQ(contents(stream), expected.bytes);
   EXPECT_EQ(pos, static_cast<Long>(expected.size()));
-  // Serial number, then the count 13.
-  EXPECT_EQ(Bytes(stream.begin(), stream.begin() + 12),
-            (Bytes{0x04, 0, 0, 0, 'T', 'S', '-', '7', 0x0D, 0, 0, 0}));
-
   tTileSet ts_back;
   tTileSetCalibration tsc_back;
   pos = 0;
@@ -269,6 +232,8 @@ TEST(Streams, TileSetWriterRefusesBeforeWritingAnything) {
   EXPECT_TRUE(refused(tile_set(1, 255), calibration(1, 255)));  // beyond the 8-bit counter
   EXPECT_TRUE(refused(tile_set(-1, 3), calibration(-1, 3)));
   EXPECT_TRUE(refused(tile_set(5, 4), calibration(5, 4)));  // no tiles: unreadable
+  tTileSet two_ranks{u"TS-7", Array<tTileDef>({{1, 2}, {1, 2}})};
+  EXPECT_TRUE(refused(two_ranks, calibration(1, 2)));
   EXPECT_TRUE(log.entries.empty());
 
   // The limits themselves are accepted.
@@ -277,46 +242,26 @@ TEST(Streams, TileSetWriterRefusesBeforeWritingAnything) {
   EXPECT_TRUE(streams().Stream_TileSetCalibration(kTo, stream, pos, largest, largest_calibration));
 }
 
-TEST(Streams, TileSetReaderRefusesCountsAndShortStreams) {
-  LogCapture log;
-  const tTileSet ts_before = tile_set(0, 2, u"old");
-  const tTileSetCalibration tsc_before = calibration(0, 2, u"old");
-  auto read = [&](const Bytes& bytes) {
-    tTileSet ts = ts_before;
-    tTileSetCalibration tsc = tsc_before;
-    ByteArray stream = stream_of(bytes);
-    Long pos = 0;
-    testing::reset_largest_allocation();
-    const bool ok = streams().Stream_TileSetCalibration(kFrom, stream, pos, ts, tsc);
-    EXPECT_EQ(ts, ts_before);
-    EXPECT_EQ(tsc, tsc_before);
-    EXPECT_LT(testing::largest_allocation(), 65536u);
-    return ok;
-  };
-  const Bytes padding(2000, 0);
-  auto with_count = [&](std::int32_t n) {
-    Wire w;
-    w.str("TS-7").l32(n);
-    w.bytes.insert(w.bytes.end(), padding.begin(), padding.end());
-    return w.bytes;
-  };
-  EXPECT_FALSE(read(with_count(0)));
-  EXPECT_FALSE(read(with_count(-3)));
-  EXPECT_FALSE(read(with_count(255)));
-  EXPECT_FALSE(read(with_count(0x7FFFFFFF)));
-  EXPECT_FALSE(read(with_count(5)));  // five tiles need more than 2000 bytes
-  EXPECT_TRUE(log.entries.empty());   // refused before reading any tile
-
+TEST(Streams, TileSetReaderRefusesShortStreams) {
   // A stream cut anywhere reads back False, one entry at most, records unchanged.
+  LogCapture log;
   tTileSet ts = tile_set(0, 1);
   tTileSetCalibration tsc = calibration(0, 1);
   ByteArray full(0, -1);
   Long pos = 0;
   ASSERT_TRUE(streams().Stream_TileSetCalibration(kTo, full, pos, ts, tsc));
   const Bytes bytes = contents(full);
+  const tTileSet ts_before = tile_set(0, 2, u"old");
+  const tTileSetCalibration tsc_before = calibration(0, 2, u"old");
   for (std::size_t cut = 0; cut < bytes.size(); ++cut) {
     log.entries.clear();
-    EXPECT_FALSE(read(Bytes(bytes.begin(), bytes.begin() + static_cast<long>(cut)))) << cut;
+    ts = ts_before;
+    tsc = tsc_before;
+    ByteArray stream = stream_of(Bytes(bytes.begin(), bytes.begin() + static_cast<long>(cut)));
+    pos = 0;
+    EXPECT_FALSE(streams().Stream_TileSetCalibration(kFrom, stream, pos, ts, tsc)) << cut;
+    EXPECT_EQ(ts, ts_before) << cut;
+    EXPECT_EQ(tsc, tsc_before) << cut;
     EXPECT_LE(log.entries.size(), 1u) << cut;
   }
 }
@@ -359,11 +304,6 @@ TEST(Streams, ProfileCarriesItsTypeNameAndInterleavedTables) {
   }
   EXPECT_EQ(contents(stream), expected.bytes);
   EXPECT_EQ(pos, 8 + 8 + 1 + 20 + 1280);
-  // The type name as L 16 and 16 bytes, then wCal(0)(1) = 100.25, wave(0)(1) = 200.25.
-  EXPECT_EQ(Bytes(stream.begin() + 17, stream.begin() + 45),
-            (Bytes{0x10, 0,   0,   0,   't', 'O', 'V',  'P',  'r',  'o',  'f',  'i',  'l',  'e',
-                   'D',  'a', 't', 'a', 'V', '1', 0x00, 0x80, 0xC8, 0x42, 0x00, 0x40, 0x48, 0x43}));
-
   tOVProfile back;
   pos = 0;
   ASSERT_TRUE(streams().Stream_Profile(kFrom, stream, pos, back));
@@ -382,39 +322,6 @@ TEST(Streams, ProfileWriterNeedsItsTables) {
   EXPECT_EQ(stream.ubound(), -1);
   EXPECT_EQ(pos, 0);
 }
-
-TEST(Streams, ProfileReaderChecksTheTypeNameAfterStoringTheHeader) {
-  LogCapture log;
-  tOVProfile pro = profile();
-  pro.ISN = u"old";
-  const Variant old_tables = pro.ProfileData;
-  Wire w;
-  w.str("NEW").f64(7.0).boolean(false).str("tOVProfileDataV2");
-  for (int k = 0; k < 320; ++k) w.f32(1.0f);
-  ByteArray stream = stream_of(w.bytes);
-  Long pos = 0;
-  EXPECT_FALSE(streams().Stream_Profile(kFrom, stream, pos, pro));
-  EXPECT_EQ(pro.ISN, u"NEW");
-  EXPECT_EQ(pro.Created, Date{7.0});
-  EXPECT_FALSE(pro.Validated);
-  EXPECT_EQ(pro.ProfileData, old_tables);
-
-  // Tables cut short: ProfileData is not replaced, one entry.
-  Wire cut;
-  cut.str("NEW").f64(7.0).boolean(true).str("tOVProfileDataV1").f32(9.0f);
-  stream = stream_of(cut.bytes);
-  pos = 0;
-  EXPECT_FALSE(streams().Stream_Profile(kFrom, stream, pos, pro));
-  EXPECT_TRUE(pro.Validated);
-  EXPECT_EQ(pro.ProfileData, old_tables);
-  EXPECT_EQ(log.entries.size(), 1u);
-}
-
-}  // namespace
-}  // namespace kvdata
-
-namespace kvdata {
-namespace {
 
 // Every writer's output reads back to an equal record, one record after
 // another in one stream, here in a stream loaded with lower bound 1.
