@@ -23,6 +23,7 @@ namespace {
 using testing::error_number;
 
 using Spread = KVTestRunSpreadTestData;
+using Rows = std::vector<std::vector<Single>>;
 
 template <class T = Single>
 Variant sample(std::initializer_list<T> values, Long lower = 1) {
@@ -34,6 +35,19 @@ Variant sample(std::initializer_list<T> values, Long lower = 1) {
 
 const Array<Single>& table(const Variant& v) {
   return v.get<Array<Single>>();
+}
+
+// A table as rows 1 (white) and 2 (blue) of points 1..n.
+Rows rows(const Variant& v) {
+  const Array<Single>& a = table(v);
+  EXPECT_EQ(a.lbound(1), 1);
+  EXPECT_EQ(a.lbound(2), 1);
+  Rows r;
+  for (Long t = 1; t <= a.ubound(1); ++t) {
+    r.emplace_back();
+    for (Long p = 1; p <= a.ubound(2); ++p) r.back().push_back(a(t, p));
+  }
+  return r;
 }
 
 TEST(KVTestRunSpreadTestData, StartsEmptyAndRefusesWorkUntilInitialisedAndSelected) {
@@ -63,12 +77,7 @@ TEST(KVTestRunSpreadTestData, StartsEmptyAndRefusesWorkUntilInitialisedAndSelect
   EXPECT_EQ(rr->KVRR_SetStdDev(sample({1.0f, 2.0f, 3.0f})), Spread::kNotReady);
   EXPECT_EQ(rr->KVRR_CalculateSpreadTestData(), Spread::kNotReady);
   EXPECT_EQ(rr->KVRR_GetCurrentTestIndex(), 2);
-  const Array<Single> zeros = table(rr->KVRR_GetAverageWL());
-  EXPECT_EQ(zeros.lbound(1), 1);
-  EXPECT_EQ(zeros.ubound(1), 2);
-  EXPECT_EQ(zeros.lbound(2), 1);
-  EXPECT_EQ(zeros.ubound(2), 3);
-  for (Single v : zeros) EXPECT_EQ(v, 0.0f);
+  EXPECT_EQ(rows(rr->KVRR_GetAverageWL()), Rows(2, std::vector<Single>(3, 0.0f)));
 }
 
 TEST(KVTestRunSpreadTestData, ComputesMeanLowestHighestAndSpreadPerTileAndPoint) {
@@ -90,29 +99,13 @@ TEST(KVTestRunSpreadTestData, ComputesMeanLowestHighestAndSpreadPerTileAndPoint)
 
   EXPECT_EQ(rr->KVRR_CalculateSpreadTestData(), 0);
   EXPECT_EQ(rr->KVRR_GetCurrentTestIndex(), 2);
-  const Array<Single> avg = table(rr->KVRR_GetAverageWL());
-  const Array<Single> low = table(rr->KVRR_GetLowestWL());
-  const Array<Single> high = table(rr->KVRR_GetHighestWL());
-  const Array<Single> spread = table(rr->KVRR_GetSpreadOfEachWL());
-  // 10, 20, 30 at point 2.
-  EXPECT_EQ(avg(1, 2), 20.0f);
-  EXPECT_EQ(low(1, 2), 10.0f);
-  EXPECT_EQ(high(1, 2), 30.0f);
-  EXPECT_EQ(spread(1, 2), 20.0f);
-  EXPECT_EQ(spread(1, 1), 0.0f);
-  // Every sample at 9999 or more: the lowest stays at its start of 9999.
-  EXPECT_EQ(low(1, 3), 9999.0f);
-  EXPECT_EQ(high(1, 3), 12000.0f);
-  // One blue sample: it is the mean, the lowest and the highest; at -10000
-  // the highest stays at its start of -9999.
-  EXPECT_EQ(avg(2, 2), 5.5f);
-  EXPECT_EQ(low(2, 2), 5.5f);
-  EXPECT_EQ(high(2, 2), 5.5f);
-  EXPECT_EQ(spread(2, 2), 0.0f);
-  EXPECT_EQ(low(2, 1), -10000.0f);
-  EXPECT_EQ(high(2, 1), -9999.0f);
-  EXPECT_EQ(spread(2, 1), 1.0f);
-  EXPECT_EQ(avg(2, 3), -2.0f);
+  // White point 3 has every sample at 9999 or more: the lowest stays at its
+  // start of 9999. Blue has one sample, so it is the mean, the lowest and
+  // the highest, except at -10000, where the highest stays at its start of -9999.
+  EXPECT_EQ(rows(rr->KVRR_GetAverageWL()), (Rows{{1, 20, 10666.5f}, {-10000, 5.5f, -2}}));
+  EXPECT_EQ(rows(rr->KVRR_GetLowestWL()), (Rows{{1, 10, 9999}, {-10000, 5.5f, -2}}));
+  EXPECT_EQ(rows(rr->KVRR_GetHighestWL()), (Rows{{1, 30, 12000}, {-9999, 5.5f, -2}}));
+  EXPECT_EQ(rows(rr->KVRR_GetSpreadOfEachWL()), (Rows{{0, 20, 2001}, {1, 0, 0}}));
 }
 
 TEST(KVTestRunSpreadTestData, MeanRoundsTheSumToSingleAfterEverySample) {
@@ -136,13 +129,8 @@ TEST(KVTestRunSpreadTestData, ATileWithoutSamplesStopsTheCalculation) {
   rr->KVRR_AddSpectralData(sample({2.0f, 8.0f}));
   EXPECT_EQ(rr->KVRR_CalculateSpreadTestData(), Spread::kNoSamples);
   EXPECT_EQ(rr->KVRR_GetCurrentTestIndex(), 2);
-  Array<Single> avg = table(rr->KVRR_GetAverageWL());
-  Array<Single> low = table(rr->KVRR_GetLowestWL());
-  EXPECT_EQ(avg(1, 1), 3.0f);
-  EXPECT_EQ(avg(1, 2), 7.0f);
-  EXPECT_EQ(low(1, 1), 2.0f);
-  EXPECT_EQ(avg(2, 1), 0.0f);
-  EXPECT_EQ(low(2, 1), 0.0f);  // untouched, not 9999
+  EXPECT_EQ(rows(rr->KVRR_GetAverageWL()), (Rows{{3, 7}, {0, 0}}));
+  EXPECT_EQ(rows(rr->KVRR_GetLowestWL()), (Rows{{2, 6}, {0, 0}}));  // blue untouched, not 9999
 
   // Blue rows computed once keep their values when the blue samples are gone.
   rr->KVRR_SetCurrentTestToBlueTile();
@@ -152,7 +140,7 @@ TEST(KVTestRunSpreadTestData, ATileWithoutSamplesStopsTheCalculation) {
   rr->KVRR_SetCurrentTestToWhiteTile();
   rr->KVRR_AddSpectralData(sample({10.0f, 10.0f}));
   EXPECT_EQ(rr->KVRR_CalculateSpreadTestData(), Spread::kNoSamples);
-  avg = table(rr->KVRR_GetAverageWL());
+  const Array<Single> avg = table(rr->KVRR_GetAverageWL());
   EXPECT_FLOAT_EQ(avg(1, 1), 16.0f / 3.0f);
   EXPECT_EQ(avg(2, 2), 3.0f);
   EXPECT_EQ(table(rr->KVRR_GetHighestWL())(2, 1), 1.0f);
@@ -204,19 +192,13 @@ TEST(KVTestRunSpreadTestData, NewSamplesFollowTheTileFlagNotTheCurrentIndex) {
   EXPECT_EQ(rr->KVRR_GetBlueRepeatibilitySpectralData()->Count(), 1);
   // ... while the standard deviations go to the blue row until a tile is selected.
   ASSERT_EQ(rr->KVRR_SetStdDev(sample({0.25f, 0.5f})), 0);
-  Array<Single> sd = table(rr->KVRR_GetStdDev());
-  EXPECT_EQ(sd(2, 1), 0.25f);
-  EXPECT_EQ(sd(2, 2), 0.5f);
-  EXPECT_EQ(sd(1, 1), 0.0f);
+  EXPECT_EQ(rows(rr->KVRR_GetStdDev()), (Rows{{0, 0}, {0.25f, 0.5f}}));
   rr->KVRR_SetCurrentTestToWhiteTile();
   // Any bounds that accept 1..n will do; one that stops short fails after
   // writing what it could.
   ASSERT_EQ(rr->KVRR_SetStdDev(sample<Double>({9.0, 0.125, 0.75, 9.0}, 0)), 0);
   EXPECT_EQ(error_number([&] { rr->KVRR_SetStdDev(sample({7.0f})); }), kSubscriptOutOfRange);
-  sd = table(rr->KVRR_GetStdDev());
-  EXPECT_EQ(sd(1, 1), 7.0f);
-  EXPECT_EQ(sd(1, 2), 0.75f);
-  EXPECT_EQ(sd(2, 2), 0.5f);
+  EXPECT_EQ(rows(rr->KVRR_GetStdDev()), (Rows{{7, 0.75f}, {0.25f, 0.5f}}));
 }
 
 TEST(KVTestRunSpreadTestData, ReinitialisingDropsSamplesAndZeroesTables) {
@@ -236,10 +218,8 @@ TEST(KVTestRunSpreadTestData, ReinitialisingDropsSamplesAndZeroesTables) {
   EXPECT_NE(rr->KVRR_GetWhiteRepeatibilitySpectralData(), old_whites);
   EXPECT_EQ(old_whites->Count(), 1);  // the caller's reference keeps its samples
   for (const Variant& t : {rr->KVRR_GetAverageWL(), rr->KVRR_GetLowestWL(), rr->KVRR_GetHighestWL(),
-                           rr->KVRR_GetSpreadOfEachWL(), rr->KVRR_GetStdDev()}) {
-    EXPECT_EQ(table(t).ubound(2), 4);
-    for (Single v : table(t)) EXPECT_EQ(v, 0.0f);
-  }
+                           rr->KVRR_GetSpreadOfEachWL(), rr->KVRR_GetStdDev()})
+    EXPECT_EQ(rows(t), Rows(2, std::vector<Single>(4, 0.0f)));
   // The blue flag is still set, but a tile must be selected again.
   EXPECT_EQ(rr->KVRR_AddSpectralData(sample({1.0f, 1.0f, 1.0f, 1.0f})), Spread::kNotReady);
 
@@ -339,12 +319,6 @@ TEST(KVTestRunSpreadTestData, KeepsTheCallersToleranceSetUntilReleased) {
   rr->KVRR_ReleaseSpreadTestData();
   EXPECT_EQ(set.use_count(), 1);
 }
-
-}  // namespace
-}  // namespace kvdata
-
-namespace kvdata {
-namespace {
 
 // Pseudo-random tests of every sample type, one stopped part way, give the
 // tables bit for bit as recorded when each value went through its Variant.
