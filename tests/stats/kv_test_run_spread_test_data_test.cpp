@@ -57,9 +57,7 @@ TEST(KVTestRunSpreadTestData, StartsEmptyAndRefusesWorkUntilInitialisedAndSelect
   EXPECT_EQ(rr->KVRR_GetCurrentTestIndex(), 0);
   EXPECT_EQ(rr->KVRR_GetWhiteRepeatibilitySpectralData(), nullptr);
   EXPECT_EQ(rr->KVRR_GetBlueRepeatibilitySpectralData(), nullptr);
-  const Variant avg = rr->KVRR_GetAverageWL();
-  EXPECT_EQ(avg.type(), static_cast<VarType>(8192 + 4));
-  EXPECT_EQ(table(avg).rank(), 0);
+  EXPECT_EQ(table(rr->KVRR_GetAverageWL()).rank(), 0);
   EXPECT_EQ(table(rr->KVRR_GetStdDev()).rank(), 0);
 
   // A tile selected but not initialised.
