@@ -461,7 +461,7 @@ TEST(ObjectBadInputTruncation, TileStreamsCutShort) {
   }
   const auto cal_bytes = encoding(*calibration());
   ASSERT_EQ(cal_bytes.size(), 4188u);
-  for (std::size_t cut = 0; cut < cal_bytes.size(); cut += 7) {
+  for (std::size_t cut = 0; cut < cal_bytes.size(); ++cut) {
     auto cal = KVCalibration::create();
     cal->TSN(u"OLD");
     ByteArray s = stream_of(prefix(cal_bytes, cut));
@@ -477,7 +477,7 @@ TEST(ObjectBadInputTruncation, TileStreamsCutShort) {
   // ones before it.
   const auto set_bytes = encoding(*tile_set());
   ASSERT_EQ(set_bytes.size(), 8u + 13u * 264u);
-  for (std::size_t cut = 0; cut < set_bytes.size(); cut += 5) {
+  for (std::size_t cut = 0; cut < set_bytes.size(); ++cut) {
     log.entries.clear();
     auto set = KVTileSet::create();
     set->TSN(u"OLD");

@@ -413,15 +413,5 @@ TEST(KVProfile, StreamLenIsWhatStreamOutWrites) {
   EXPECT_EQ(p->ISN(), u"ABC\u20AC");
 }
 
-TEST(KVProfile, IdentityFollowsTheRecord) {
-  auto p = KVProfile::create();
-  EXPECT_EQ(p->ID(), Variant(String(u"")));
-  EXPECT_EQ(p->DateCreated().get<Date>(), Date{});
-  p->ISN(u"X9");
-  p->Created(Date{44000.75});
-  EXPECT_EQ(p->ID().get<String>(), u"X9");
-  EXPECT_EQ(p->DateCreated().get<Date>(), Date{44000.75});
-}
-
 }  // namespace
 }  // namespace kvdata

@@ -138,52 +138,6 @@ TEST(KVTolSet, StreamOutSetsTheArrayToItsOwnEnd) {
   EXPECT_EQ(unbounded.ubound(), 2031);
 }
 
-TEST(KVTolSet, StreamInStopsAtTheFirstBadMember) {
-  ByteArray bytes;
-  ASSERT_TRUE(two_member_set()->StreamOut(bytes));
-
-  // A repeated ID: the first member stays, the second is refused.
-  ByteArray same_ids = bytes;
-  same_ids(533 + 749) = 0x05;
-  auto set = KVTolSet::create();
-  Long pos = 0;
-  EXPECT_FALSE(set->StreamIn(same_ids, pos));
-  EXPECT_EQ(pos, 2031);
-  EXPECT_EQ(member_ids(*set), (std::vector<Long>{5}));
-  EXPECT_EQ(set->InstTypeID(), 3);  // the header as read
-
-  // A count larger than the stream holds stops when the bytes run out.
-  ByteArray huge = bytes;
-  huge(528) = 0xFF;
-  huge(529) = 0xFF;
-  huge(530) = 0xFF;
-  huge(531) = 0x7F;
-  pos = 0;
-  EXPECT_FALSE(set->StreamIn(huge, pos));
-  EXPECT_EQ(member_ids(*set), (std::vector<Long>{5, 9}));
-  EXPECT_EQ(pos, 2032);  // past the spare element, the last one there was
-
-  // A count of 0 or less: no members, True after the header.
-  for (int count_high_byte : {0x00, 0x80}) {
-    ByteArray none = bytes;
-    none(528) = 0x00;
-    none(531) = static_cast<kvdata::Byte>(count_high_byte);
-    pos = 0;
-    EXPECT_TRUE(set->StreamIn(none, pos));
-    EXPECT_EQ(pos, 533);
-    EXPECT_EQ(set->count(), 0);
-  }
-
-  // A short header: False, members removed, header unchanged.
-  auto kept = two_member_set();
-  ByteArray short_header(0, 99);
-  pos = 0;
-  EXPECT_FALSE(kept->StreamIn(short_header, pos));
-  EXPECT_EQ(pos, 100);
-  EXPECT_EQ(kept->count(), 0);
-  EXPECT_EQ(kept->InstTypeID(), 3);
-}
-
 TEST(KVTolSet, ItemLooksUpTextKeysNeverPositions) {
   auto set = two_member_set();
   IKVTolSet& s = *set;

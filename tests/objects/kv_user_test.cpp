@@ -10,6 +10,7 @@
 #include "kvdata/foundation/ikv_db_object.hpp"
 #include "kvdata/foundation/ikv_security.hpp"
 #include "objects/expected_bytes.hpp"
+#include "objects/kv_profile_test_support.hpp"
 
 namespace {
 
@@ -54,17 +55,7 @@ std::shared_ptr<KVUser> sample() {
   return user;
 }
 
-// Collects event-log entries for the life of the object.
-class LogCapture {
- public:
-  LogCapture()
-      : previous_(kvdata::EventLog::SetSink([this](const String& t) { entries.push_back(t); })) {}
-  ~LogCapture() { kvdata::EventLog::SetSink(previous_); }
-  std::vector<String> entries;
-
- private:
-  kvdata::EventLog::Sink previous_;
-};
+using kvdata::profile_testing::LogCapture;
 
 TEST(KVUser, StreamIsTheStampAndTheBlockWithOneSpareByte) {
   const auto expected = sample_image();
