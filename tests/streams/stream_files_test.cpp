@@ -115,20 +115,5 @@ TEST_F(StreamFiles, LoadingNothingLeavesTheArrayAlone) {
   EXPECT_EQ(a, before);
 }
 
-TEST_F(StreamFiles, ALoadedStreamIsReadFromPositionOne) {
-  tStation st{u"{G}", u"Name", u"Mail"};
-  ByteArray stream(0, -1);
-  Long pos = 0;
-  ASSERT_TRUE(streams().Stream_Station(eStreamDirection::ToStream, stream, pos, st));
-  ASSERT_TRUE(streams().StreamSave(name_of(path("station.bin")), stream));
-  ByteArray loaded;
-  ASSERT_TRUE(streams().StreamLoad(name_of(path("station.bin")), loaded));
-  tStation back;
-  pos = 1;
-  ASSERT_TRUE(streams().Stream_Station(eStreamDirection::FromStream, loaded, pos, back));
-  EXPECT_EQ(back, st);
-  EXPECT_EQ(pos, loaded.ubound() + 1);
-}
-
 }  // namespace
 }  // namespace kvdata
