@@ -19,9 +19,12 @@ namespace {
 
 using testing::contents;
 using testing::LogCapture;
+using testing::organization;
+using testing::profile;
 using testing::sc_pair;
 using testing::spectrum;
 using testing::stream_of;
+using testing::user;
 using testing::Wire;
 using Bytes = std::vector<Byte>;
 
@@ -36,34 +39,6 @@ Streams& streams() {
 
 tStation station() {
   return tStation{u"{4F1C}", u"Lab 2", u"lab2@example.org"};
-}
-
-tOVProfile profile() {
-  tOVProfile pro;
-  pro.ISN = u"SN42";
-  pro.Created = Date{45123.5};
-  pro.Validated = true;
-  tOVProfileDataV1 tables;
-  tables.wCal(0) = spectrum(100);
-  tables.Dark(1) = spectrum(400);
-  pro.ProfileData = Variant(tables);
-  return pro;
-}
-
-tUser user() {
-  tUser u;
-  u.USERID = u"ANN";
-  u.UserNumber = 12;
-  u.LastName = u"Smith";
-  u.FirstName = u"Ann";
-  u.UserMail = u"ann@example.org";
-  u.OrgID = 3;
-  u.RoleCode = u"A";
-  return u;
-}
-
-tOrganization organization() {
-  return tOrganization{4, u"Calibration Lab", 1, 1, u"CAL", u"Y"};
 }
 
 // One record stream under test: how to write a sample and how to read into
@@ -82,77 +57,58 @@ struct Case {
   bool logs = true;
 };
 
+// A case for a record stream `fn`: writes `sample`, reads into a copy of
+// `before`, and `unchanged` tells whether that copy is still as it was.
+template <class R>
+Case record_case(const char* name,
+                 bool (Streams::*fn)(const eStreamDirection&, ByteArray&, Long&, R&), R sample,
+                 R before, std::function<bool(const R&)> unchanged, Long block = 0,
+                 bool logs = true) {
+  return {name,
+          [=](ByteArray& s, Long& p) {
+            R r = sample;
+            return (streams().*fn)(kTo, s, p, r);
+          },
+          [=](ByteArray& s, Long& p, bool& same) {
+            R r = before;
+            const bool ok = (streams().*fn)(kFrom, s, p, r);
+            same = unchanged(r);
+            return ok;
+          },
+          block, logs};
+}
+
+template <class R>
+std::function<bool(const R&)> equals(R before) {
+  return [before](const R& r) { return r == before; };
+}
+
 std::vector<Case> cases() {
-  std::vector<Case> all;
-  all.push_back({"SC pair",
-                 [](ByteArray& s, Long& p) {
-                   tSCPair pair = sc_pair(1);
-                   return streams().Stream_SCPair(kTo, s, p, pair);
-                 },
-                 [](ByteArray& s, Long& p, bool& unchanged) {
-                   // Values are stored as they are read: the first one
-                   // decides whether anything changed.
-                   tSCPair pair = sc_pair(7);
-                   const bool ok = streams().Stream_SCPair(kFrom, s, p, pair);
-                   unchanged =
-                       pair.Spectrum(eSC::SCE).Data(1) == sc_pair(7).Spectrum(eSC::SCE).Data(1);
-                   return ok;
-                 }});
-  all.push_back({"station",
-                 [](ByteArray& s, Long& p) {
-                   tStation st = station();
-                   return streams().Stream_Station(kTo, s, p, st);
-                 },
-                 [](ByteArray& s, Long& p, bool& unchanged) {
-                   // A first count that cannot be read empties StationGUID
-                   // (the codec's rule); the name after it is not attempted.
-                   tStation st{u"a", u"b", u"c"};
-                   const bool ok = streams().Stream_Station(kFrom, s, p, st);
-                   unchanged = st.StationName == u"b";
-                   return ok;
-                 }});
-  all.push_back({"profile",
-                 [](ByteArray& s, Long& p) {
-                   tOVProfile pro = profile();
-                   return streams().Stream_Profile(kTo, s, p, pro);
-                 },
-                 [](ByteArray& s, Long& p, bool& unchanged) {
-                   // The tables are replaced only when all 320 values were read.
-                   tOVProfile pro;
-                   pro.ProfileData = Variant(String(u"old"));
-                   const bool ok = streams().Stream_Profile(kFrom, s, p, pro);
-                   unchanged = pro.ProfileData == Variant(String(u"old"));
-                   return ok;
-                 }});
-  all.push_back({"user block",
-                 [](ByteArray& s, Long& p) {
-                   tUser u = user();
-                   return streams().Stream_User(kTo, s, p, u);
-                 },
-                 [](ByteArray& s, Long& p, bool& unchanged) {
-                   tUser u;
-                   u.USERID = u"OLD";
-                   const tUser before = u;
-                   const bool ok = streams().Stream_User(kFrom, s, p, u);
-                   unchanged = u == before;
-                   return ok;
-                 },
-                 261, false});
-  all.push_back({"organization",
-                 [](ByteArray& s, Long& p) {
-                   tOrganization org = organization();
-                   return streams().Stream_Organization(kTo, s, p, org);
-                 },
-                 [](ByteArray& s, Long& p, bool& unchanged) {
-                   tOrganization org;
-                   org.Alias = u"OLD";
-                   const tOrganization before = org;
-                   const bool ok = streams().Stream_Organization(kFrom, s, p, org);
-                   unchanged = org == before;
-                   return ok;
-                 },
-                 133, false});
-  return all;
+  tOVProfile old_tables;
+  old_tables.ProfileData = Variant(String(u"old"));
+  tUser old_user;
+  old_user.USERID = u"OLD";
+  tOrganization old_org;
+  old_org.Alias = u"OLD";
+  return {// Values are stored as they are read: the first one decides whether
+          // anything changed.
+          record_case<tSCPair>("SC pair", &Streams::Stream_SCPair, sc_pair(1), sc_pair(7),
+                               [](const tSCPair& r) {
+                                 return r.Spectrum(eSC::SCE).Data(1) ==
+                                        sc_pair(7).Spectrum(eSC::SCE).Data(1);
+                               }),
+          // A first count that cannot be read empties StationGUID (the codec's
+          // rule); the name after it is not attempted.
+          record_case<tStation>("station", &Streams::Stream_Station, station(), {u"a", u"b", u"c"},
+                                [](const tStation& r) { return r.StationName == u"b"; }),
+          // The tables are replaced only when all 320 values were read.
+          record_case<tOVProfile>(
+              "profile", &Streams::Stream_Profile, profile(), old_tables,
+              [](const tOVProfile& r) { return r.ProfileData == Variant(String(u"old")); }),
+          record_case<tUser>("user block", &Streams::Stream_User, user(), old_user,
+                             equals(old_user), 261, false),
+          record_case<tOrganization>("organization", &Streams::Stream_Organization, organization(),
+                                     old_org, equals(old_org), 133, false)};
 }
 
 // The sample's encoding from index 0.

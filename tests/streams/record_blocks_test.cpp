@@ -11,7 +11,9 @@ namespace {
 
 using testing::contents;
 using testing::LogCapture;
+using testing::organization;
 using testing::stream_of;
+using testing::user;
 using testing::Wire;
 using Bytes = std::vector<Byte>;
 
@@ -24,21 +26,6 @@ Streams& streams() {
 
 String blanks(std::size_t n) {
   return String(n, u' ');
-}
-
-// Every text longer than its field or shorter than it.
-tUser user() {
-  tUser u;
-  u.USERID = u"ABCDEFGHIJ";  // cut to 8
-  u.UserNumber = 0x01020304;
-  u.LastName = u"Smith";                             // padded to 30
-  u.FirstName = u"Bartholomew-Maximilian-Johannes";  // 31, cut to 30
-  u.UserPWD = u"pw";
-  u.UserMail = u"a@b.c";
-  u.OrgID = -2;
-  u.RoleCode = u"AB";  // cut to 1
-  u.Disabled = u"Y";
-  return u;
 }
 
 Wire expected_user_block() {
@@ -123,11 +110,6 @@ TEST(RecordBlocks, UserBlockInAShortStream) {
   EXPECT_FALSE(streams().Stream_User(kTo, none, pos, u));
   EXPECT_FALSE(none.has_bounds());
   EXPECT_EQ(pos, 0);
-}
-
-tOrganization organization() {
-  return tOrganization{
-      7, u"Kelvanto Calibration Laboratories of the Northern Region, Ltd", 1, -1, u"KL", u"Y"};
 }
 
 Wire expected_organization_block() {

@@ -11,6 +11,8 @@ namespace {
 
 using testing::contents;
 using testing::LogCapture;
+using testing::profile;
+using testing::profile_tables;
 using testing::put;
 using testing::sc_pair;
 using testing::spectrum;
@@ -258,26 +260,6 @@ TEST(Streams, TileSetReaderRefusesShortStreams) {
 }
 
 // --- Profile ----------------------------------------------------------------
-
-tOVProfileDataV1 profile_tables() {
-  tOVProfileDataV1 t;
-  for (Long k = 0; k <= 1; ++k) {
-    t.wCal(k) = spectrum(static_cast<float>(k) * 1000 + 100);
-    t.wave(k) = spectrum(static_cast<float>(k) * 1000 + 200);
-    t.Linear(k) = spectrum(static_cast<float>(k) * 1000 + 300);
-    t.Dark(k) = spectrum(static_cast<float>(k) * 1000 + 400);
-  }
-  return t;
-}
-
-tOVProfile profile() {
-  tOVProfile pro;
-  pro.ISN = u"SN42";
-  pro.Created = Date{45123.5};
-  pro.Validated = true;
-  pro.ProfileData = Variant(profile_tables());
-  return pro;
-}
 
 TEST(Streams, ProfileCarriesItsTypeNameAndInterleavedTables) {
   tOVProfile pro = profile();

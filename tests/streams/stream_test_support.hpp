@@ -107,6 +107,46 @@ inline Wire& put(Wire& w, const tSCPair& p) {
   return put(w, p.Spectrum(eSC::SCI));
 }
 
+// Sample records with a distinct value in every field.
+inline tOVProfileDataV1 profile_tables() {
+  tOVProfileDataV1 t;
+  for (Long k = 0; k <= 1; ++k) {
+    t.wCal(k) = spectrum(static_cast<float>(k) * 1000 + 100);
+    t.wave(k) = spectrum(static_cast<float>(k) * 1000 + 200);
+    t.Linear(k) = spectrum(static_cast<float>(k) * 1000 + 300);
+    t.Dark(k) = spectrum(static_cast<float>(k) * 1000 + 400);
+  }
+  return t;
+}
+
+inline tOVProfile profile() {
+  tOVProfile pro;
+  pro.ISN = u"SN42";
+  pro.Created = Date{45123.5};
+  pro.Validated = true;
+  pro.ProfileData = Variant(profile_tables());
+  return pro;
+}
+
+// Every text longer than its field or shorter than it.
+inline tUser user() {
+  tUser u;
+  u.USERID = u"ABCDEFGHIJ";  // cut to 8
+  u.UserNumber = 0x01020304;
+  u.LastName = u"Smith";                             // padded to 30
+  u.FirstName = u"Bartholomew-Maximilian-Johannes";  // 31, cut to 30
+  u.UserPWD = u"pw";
+  u.UserMail = u"a@b.c";
+  u.OrgID = -2;
+  u.RoleCode = u"AB";  // cut to 1
+  u.Disabled = u"Y";
+  return u;
+}
+inline tOrganization organization() {
+  return tOrganization{
+      7, u"Kelvanto Calibration Laboratories of the Northern Region, Ltd", 1, -1, u"KL", u"Y"};
+}
+
 // Largest single allocation requested since the last reset (the stream
 // tests replace the global allocation functions to observe it).
 void reset_largest_allocation();
