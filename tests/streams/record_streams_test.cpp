@@ -92,14 +92,6 @@ TEST(Streams, SCPairWriterGrowsTheStreamAsItsValuesOneByOneWould) {
   Bytes want{0xAA, 0xBB, 0x00, 0x00};
   want.insert(want.end(), expected.bytes.begin(), expected.bytes.end());
   EXPECT_EQ(contents(loaded), want);
-
-  // A longer stream keeps its length and the bytes after the pair.
-  ByteArray longer = stream_of(Bytes(400, 0x11));
-  pos = 0;
-  ASSERT_TRUE(streams().Stream_SCPair(kTo, longer, pos, copy));
-  EXPECT_EQ(longer.ubound(), 399);
-  EXPECT_EQ(Bytes(longer.begin(), longer.begin() + 320), expected.bytes);
-  EXPECT_EQ(longer(320), 0x11);
   EXPECT_TRUE(log.entries.empty());
 
   // A Position below the lower bound: the first value fails, logs its one
