@@ -297,13 +297,25 @@ TEST(BadInputHostileCounts, NegativeSeriesCountsGiveSeriesWithoutTiles) {
   EXPECT_TRUE(log.entries.empty());
 }
 
-TEST(BadInputPositions, ReadersOutsideTheStreamChangeNothing) {
+TEST(BadInputPositions, ReadersOutsideTheStreamOrWithoutBoundsChangeNothing) {
   LogCapture log;
   for (const Case& c : cases()) {
     const Bytes full = encoding(c);
-    // The stream from index 0, and the same bytes at the top of the Long range.
+    // The stream from index 0, from 1 (a loaded stream) and from -7, the same
+    // bytes at the top of the Long range, and an array without bounds.
     ByteArray low = stream_of(full);
+    ByteArray loaded = stream_of(full, 1);
+    ByteArray negative = stream_of(full, -7);
     ByteArray top = stream_of(full, kLongMax - static_cast<Long>(full.size()) + 1);
+    ByteArray none;
+    // Read from the lower bound, the record comes back whole.
+    for (ByteArray* s : {&loaded, &negative}) {
+      Long p = s->lbound();
+      bool unchanged = true;
+      EXPECT_TRUE(c.read(*s, p, unchanged)) << c.name << " from " << s->lbound();
+      EXPECT_EQ(p, s->lbound() + static_cast<Long>(full.size())) << c.name;
+      EXPECT_FALSE(unchanged) << c.name;
+    }
     const struct {
       ByteArray* stream;
       Long position;
@@ -312,6 +324,9 @@ TEST(BadInputPositions, ReadersOutsideTheStreamChangeNothing) {
         {&low, kLongMin},
         {&low, static_cast<Long>(full.size())},  // just past the end
         {&low, kLongMax},
+        {&loaded, 0},  // one index below the lower bound
+        {&negative, -8},
+        {&none, 0},
         {&top, 0},
         {&top, kLongMax - 2},  // inside, but no value fits before the Long ends
         {&top, kLongMax},
@@ -348,35 +363,6 @@ TEST(BadInputPositions, WritersBelowTheStreamWriteNothing) {
     EXPECT_EQ(s, before) << c.name;
     EXPECT_EQ(p, -1) << c.name;
     EXPECT_EQ(log.entries.size(), c.logs ? 1u : 0u) << c.name;
-  }
-}
-
-TEST(BadInputArrays, StreamsWithoutBoundsOrAnotherLowerBound) {
-  LogCapture log;
-  for (const Case& c : cases()) {
-    const Bytes full = encoding(c);
-    // Without bounds: nothing to read, the record stays.
-    log.entries.clear();
-    ByteArray none;
-    Long p = 0;
-    bool unchanged = false;
-    EXPECT_FALSE(c.read(none, p, unchanged)) << c.name;
-    EXPECT_TRUE(unchanged) << c.name;
-    EXPECT_FALSE(none.has_bounds()) << c.name;
-    EXPECT_EQ(p, 0) << c.name;
-    EXPECT_EQ(log.entries.size(), c.logs ? 1u : 0u) << c.name;
-
-    // Lower bounds 1 (a loaded stream) and -7: read from the lower bound,
-    // the record comes back whole; from one index below, it does not.
-    for (const Long lower : {1, -7}) {
-      ByteArray s = stream_of(full, lower);
-      p = lower;
-      EXPECT_TRUE(c.read(s, p, unchanged)) << c.name << " from " << lower;
-      EXPECT_EQ(p, lower + static_cast<Long>(full.size())) << c.name;
-      p = lower - 1;
-      EXPECT_FALSE(c.read(s, p, unchanged)) << c.name << " from " << lower - 1;
-      EXPECT_TRUE(unchanged) << c.name;
-    }
   }
 }
 
