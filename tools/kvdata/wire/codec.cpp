@@ -90,12 +90,16 @@ class RecordState final : public StreamState {
   RecordState(StreamKind kind, Op op, std::array<std::string_view, sizeof...(R)> names)
       : StreamState(kind), op_(op), names_(names) {}
 
+  bool read_library(ByteArray& bytes, Long& end, std::string& /*message*/) override {
+    end = bytes.has_bounds() ? bytes.lbound() : 0;
+    return call(eStreamDirection::FromStream, bytes, end);
+  }
+
   void read_stream(ByteArray& bytes) override {
-    Long pos = bytes.has_bounds() ? bytes.lbound() : 0;
     LibraryLog log;
-    if (!call(eStreamDirection::FromStream, bytes, pos)) {
-      refused(kind(), "reader refused the stream", {}, log);
-    }
+    Long end = 0;
+    std::string message;
+    if (!read_library(bytes, end, message)) refused(kind(), "reader refused the stream", {}, log);
   }
 
   void read_members(Fields& f) override {
@@ -346,16 +350,23 @@ class ObjectState final : public StreamState {
  public:
   explicit ObjectState(StreamKind kind) : StreamState(kind) {}
 
+  bool read_library(ByteArray& bytes, Long& end, std::string& message) override {
+    read_ = Class::create();
+    end = bytes.has_bounds() ? bytes.lbound() : 0;
+    if (static_cast<IKVStream&>(*read_).StreamIn(bytes, end)) return true;
+    if constexpr (requires { read_->ErrMsg(); }) message = to_utf8(read_->ErrMsg());
+    return false;
+  }
+
   void read_stream(ByteArray& bytes) override {
-    auto object = Class::create();
-    Long pos = bytes.has_bounds() ? bytes.lbound() : 0;
     LibraryLog log;
-    if (!static_cast<IKVStream&>(*object).StreamIn(bytes, pos)) {
-      std::string message;
-      if constexpr (requires { object->ErrMsg(); }) message = to_utf8(object->ErrMsg());
+    Long end = 0;
+    std::string message;
+    if (!read_library(bytes, end, message)) {
       refused(kind(), "reader refused the stream", message, log);
     }
-    take_values<Class>(*object, values_);
+    take_values<Class>(*read_, values_);
+    read_.reset();
   }
 
   void read_members(Fields& f) override { read_values(f, values_); }
@@ -383,6 +394,7 @@ class ObjectState final : public StreamState {
   }
 
  private:
+  std::shared_ptr<Class> read_;  // the object the library reader filled
   PropertyValues<Class> values_;
 };
 
@@ -390,6 +402,8 @@ template <class Class>
 std::unique_ptr<StreamState> object(StreamKind kind) {
   return std::make_unique<ObjectState<Class>>(kind);
 }
+
+}  // namespace
 
 // The one table of kinds: each object kind's class, each record kind's
 // Streams operation and the names of its record arguments.
@@ -429,8 +443,6 @@ std::unique_ptr<StreamState> stream_state(StreamKind kind) {
   }
   bad_usage("internal error: no stream of kind " + std::to_string(static_cast<int>(kind)));
 }
-
-}  // namespace
 
 std::unique_ptr<StreamState> decode_stream(StreamKind kind, ByteArray& bytes) {
   auto state = stream_state(kind);

@@ -51,9 +51,14 @@ class StreamState {
   virtual ~StreamState() = default;
   StreamKind kind() const { return kind_; }
 
+  // The library's reader alone, from the array's first element, as
+  // whatever observer is installed watches it: whether it took the stream,
+  // the Position it left in `end`, and the object's own message when it
+  // refused. Errors the reader lets out (none is documented to) pass through.
+  virtual bool read_library(ByteArray& bytes, Long& end, std::string& message) = 0;
   // Reads the stream with the library's reader from the array's first
-  // element. InputError when the reader refuses it, with the library's
-  // message and log.
+  // element and keeps what it read. InputError when the reader refuses it,
+  // with the library's message and log.
   virtual void read_stream(ByteArray& bytes) = 0;
   // Reads the document's members (other than "kind") from `f`; InputError
   // names the field of a member that is missing, unknown or malformed.
@@ -75,6 +80,9 @@ class StreamState {
  private:
   StreamKind kind_;
 };
+
+// A state of the kind, not yet read or filled.
+std::unique_ptr<StreamState> stream_state(StreamKind kind);
 
 // Reads the stream from its first element. InputError when the library's
 // reader refuses it.

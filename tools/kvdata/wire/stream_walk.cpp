@@ -5,8 +5,8 @@
 #include <vector>
 
 #include "support/library_log.hpp"
+#include "wire/codec.hpp"
 #include "wire/field_path.hpp"
-#include "wire/library_readers.hpp"
 
 namespace kvdata::cli {
 namespace {
@@ -78,17 +78,21 @@ void finish(StreamKind kind, const ByteArray& bytes, std::size_t end, Walker& wa
 
 WalkEnd walk_stream(StreamKind kind, const ByteArray& bytes, WalkSink& sink) {
   Walker walker(bytes, sink);
-  LibraryRead read;
+  bool accepted = false;
+  Long end = 0;
+  std::string message;
   // The reader's event-log entry on a refusal says less than the observer
   // was told; it is kept for the refusal that the observer was not told.
   LibraryLog log;
   {
     const ObservedStreams watch(walker);
-    read = read_with_library(kind, bytes);
+    // The Stream_ operations take the array by plain reference for both
+    // directions; reading leaves it untouched.
+    accepted = stream_state(kind)->read_library(const_cast<ByteArray&>(bytes), end, message);
   }
   walker.rethrow();
-  const auto stopped = static_cast<std::size_t>(std::max<Long>(read.end - walker.lower_, 0));
-  if (read.accepted) {
+  const auto stopped = static_cast<std::size_t>(std::max<Long>(end - walker.lower_, 0));
+  if (accepted) {
     finish(kind, bytes, stopped, walker);
     walker.rethrow();
   } else if (!walker.problem_) {
@@ -96,7 +100,7 @@ WalkEnd walk_stream(StreamKind kind, const ByteArray& bytes, WalkSink& sink) {
     walker.problem_ =
         Problem{walker.end_, std::string(kind_name(kind)),
                 "what the library's reader could take; it refused the stream here" +
-                    (read.message.empty() ? std::string() : ": " + read.message) + log.summary()};
+                    (message.empty() ? std::string() : ": " + message) + log.summary()};
   }
   return WalkEnd{std::move(walker.problem_), walker.end_};
 }
