@@ -5,6 +5,7 @@
 #include <cmath>
 #include <cstdint>
 #include <limits>
+#include <utility>
 
 #include "json/dates.hpp"
 #include "json/numbers.hpp"
@@ -19,10 +20,12 @@ Single through_text(Single v) {
 }
 
 TEST(JsonNumbers, SinglesPrintShortestAndComeBackBitForBit) {
-  EXPECT_EQ(single_to_json(0.1f).dump(), "0.1");
-  EXPECT_EQ(single_to_json(1.2f).dump(), "1.2");
-  EXPECT_EQ(single_to_json(85.25f).dump(), "85.25");
-  EXPECT_EQ(single_to_json(-0.0f).dump(), "-0.0");
+  for (const auto& [v, text] : {std::pair<Single, const char*>{0.1f, "0.1"},
+                                {1.2f, "1.2"},
+                                {85.25f, "85.25"},
+                                {-0.0f, "-0.0"}}) {
+    EXPECT_EQ(single_to_json(v).dump(), text);
+  }
   // Every bit pattern of a sweep across the whole range, denormals included.
   for (std::uint64_t bits = 0; bits < 0xFFFFFFFFull; bits += 0x00012345ull) {
     const auto v = std::bit_cast<Single>(static_cast<std::uint32_t>(bits));
@@ -36,14 +39,18 @@ TEST(JsonNumbers, SinglesPrintShortestAndComeBackBitForBit) {
 }
 
 TEST(JsonNumbers, NonFiniteSinglesTravelAsTextWithTheirBits) {
-  EXPECT_EQ(single_to_json(std::numeric_limits<Single>::infinity()), "Infinity");
-  EXPECT_EQ(single_to_json(-std::numeric_limits<Single>::infinity()), "-Infinity");
-  EXPECT_EQ(single_to_json(std::bit_cast<Single>(0x7FC00000u)), "NaN");
-  EXPECT_EQ(single_to_json(std::bit_cast<Single>(0xFFC00001u)), "NaN(0xFFC00001)");
+  for (const auto& [bits, text] : {std::pair<std::uint32_t, const char*>{0x7F800000u, "Infinity"},
+                                   {0xFF800000u, "-Infinity"},
+                                   {0x7FC00000u, "NaN"},
+                                   {0xFFC00001u, "NaN(0xFFC00001)"}}) {
+    EXPECT_EQ(single_to_json(std::bit_cast<Single>(bits)), text);
+  }
   EXPECT_EQ(std::bit_cast<std::uint32_t>(through_text(std::bit_cast<Single>(0xFFC00001u))),
             0xFFC00001u);
-  EXPECT_THROW(single_from_json(Json("NaN(0x3F800000)"), "v"), InputError);  // 1.0 is no NaN
-  EXPECT_THROW(single_from_json(Json("nan"), "v"), InputError);
+  // 1.0 is no NaN.
+  for (const Json& bad : {Json("NaN(0x3F800000)"), Json("nan"), Json("12"), Json(true)}) {
+    EXPECT_THROW(single_from_json(bad, "v"), InputError) << bad;
+  }
 }
 
 TEST(JsonNumbers, HandWrittenNumbersRoundToTheNearestSingleOrAreRefused) {
@@ -56,8 +63,6 @@ TEST(JsonNumbers, HandWrittenNumbersRoundToTheNearestSingleOrAreRefused) {
   } catch (const InputError& e) {
     EXPECT_NE(std::string(e.what()).find("TSC.TempCalibrated"), std::string::npos);
   }
-  EXPECT_THROW(single_from_json(Json("12"), "v"), InputError);
-  EXPECT_THROW(single_from_json(Json(true), "v"), InputError);
 }
 
 TEST(JsonNumbers, DoublesComeBackBitForBit) {
@@ -72,17 +77,20 @@ TEST(JsonNumbers, DoublesComeBackBitForBit) {
 }
 
 TEST(JsonDates, IsoTextOnlyWhenItIsExact) {
-  EXPECT_EQ(date_to_json(Date{0.0}), "1899-12-30");
-  EXPECT_EQ(date_to_json(Date{45366.0}), "2024-03-15");
-  EXPECT_EQ(date_to_json(Date{45366.5}), "2024-03-15T12:00:00");
-  EXPECT_EQ(date_to_json(Date{-1.0}), "1899-12-29");
-  EXPECT_EQ(date_to_json(Date{60.0}), "1900-02-28");  // 1900 is no leap year
-  EXPECT_EQ(date_to_json(Date{61.0}), "1900-03-01");
+  // 1900 is no leap year: day 60 is 28 February, 61 is 1 March.
+  for (const auto& [days, text] : {std::pair<double, const char*>{0.0, "1899-12-30"},
+                                   {45366.0, "2024-03-15"},
+                                   {45366.5, "2024-03-15T12:00:00"},
+                                   {-1.0, "1899-12-29"},
+                                   {60.0, "1900-02-28"},
+                                   {61.0, "1900-03-01"},
+                                   {45366.0 + 250.0 / 86400000.0, "2024-03-15T00:00:00.250"}}) {
+    EXPECT_EQ(date_to_json(Date{days}), text) << days;
+  }
   // 10:30:00 as a day fraction is inexact, but the text reads back to the same double.
   const Date half_past_ten{45366.0 + 37800.0 / 86400.0};
   EXPECT_EQ(date_to_json(half_past_ten), "2024-03-15T10:30:00");
   EXPECT_EQ(date_from_json(Json("2024-03-15T10:30:00"), "d"), half_past_ten);
-  EXPECT_EQ(date_to_json(Date{45366.0 + 250.0 / 86400000.0}), "2024-03-15T00:00:00.250");
   // Not a whole millisecond, a negative day with a time, and -0 stay numbers.
   EXPECT_TRUE(date_to_json(Date{45366.123456789}).is_number());
   EXPECT_TRUE(date_to_json(Date{-1.25}).is_number());

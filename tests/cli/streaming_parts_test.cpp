@@ -1,10 +1,9 @@
 // The parts the streaming commands are built from: CSV records read in
-// pieces, the number fast path, CGATS written in pieces, output files and
+// pieces, CGATS written in pieces, output files and
 // the spool.
 #include <gtest/gtest.h>
 
 #include <algorithm>
-#include <charconv>
 #include <cstring>
 #include <filesystem>
 #include <fstream>
@@ -12,7 +11,6 @@
 #include "command_runner.hpp"
 #include "spectra/cgats_reader.hpp"
 #include "spectra/cgats_writer.hpp"
-#include "spectra/csv_reader.hpp"
 #include "spectra/csv_records.hpp"
 #include "support/errors.hpp"
 #include "support/output_file.hpp"
@@ -93,53 +91,6 @@ TEST(StreamingParts, CsvRecordsInPiecesAsWhole) {
       ADD_FAILURE() << "no error";
     } catch (const InputError& e) {
       EXPECT_STREQ(e.what(), "o.csv line 3: a quoted cell is not closed");
-    }
-  }
-}
-
-TEST(StreamingParts, NumbersReadAsFromChars) {
-  const std::vector<std::string> cells = {"12.345",
-                                          "-0.5",
-                                          "+3",
-                                          " 7.25\t",
-                                          "5.",
-                                          ".5",
-                                          "-.5",
-                                          "1e2",
-                                          "0.30000000000000004",
-                                          "9007199254740992",
-                                          "9007199254740993",
-                                          "0.1234567890123456789",
-                                          "123456.7890123",
-                                          "-0.000",
-                                          "007.250",
-                                          "1234567890123456789",
-                                          "12345678901234567890",
-                                          "0.0000000000000000000001",
-                                          "0.00000000000000000000001",
-                                          "1.7976931348623157e308",
-                                          "4.9e-324"};
-  std::string text = "SAMPLE_NAME,360\n";
-  for (const std::string& c : cells) text += "s," + c + "\n";
-  const SpectraTable t = read_csv("n.csv", text);
-  ASSERT_EQ(t.rows.size(), cells.size());
-  for (std::size_t i = 0; i < cells.size(); ++i) {
-    std::string c = cells[i];
-    c.erase(0, c.find_first_not_of(" \t"));
-    c.erase(c.find_last_not_of(" \t") + 1);
-    if (c[0] == '+') c.erase(0, 1);
-    double expected = 0;
-    std::from_chars(c.data(), c.data() + c.size(), expected);
-    double got = t.rows[i].values[0];
-    EXPECT_EQ(std::memcmp(&got, &expected, sizeof got), 0) << cells[i] << ": " << got;
-  }
-  for (const std::string bad :
-       {"1.2.3", "-", ".", "1,5", "0x10", "inf", "nan", "1e999", "--1", "1 2"}) {
-    try {
-      read_csv("n.csv", "SAMPLE_NAME;360\ns;" + bad + "\n");
-      ADD_FAILURE() << bad;
-    } catch (const InputError& e) {
-      EXPECT_NE(std::string(e.what()).find("not a number"), std::string::npos) << bad;
     }
   }
 }
