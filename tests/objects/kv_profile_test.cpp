@@ -338,68 +338,6 @@ TEST(KVProfile, StreamInIsSafeOnStreamsItCannotRead) {
   EXPECT_EQ(p->ISN(), u"SN-7");
 }
 
-TEST(KVProfile, StreamOutSizesTheArrayAndCutsItAtTheFinalPosition) {
-  const Bytes image = new_profile_stream();
-  auto p = KVProfile::create();
-
-  // Past the end of a short array: its bytes kept, the gap zero.
-  ByteArray shorter(0, 50);
-  for (Byte& b : shorter) b = 0xAA;
-  Long pos = 100;
-  EXPECT_TRUE(p->StreamOut(shorter, pos));
-  EXPECT_EQ(pos, 100 + 1649);
-  EXPECT_EQ(shorter.lbound(), 0);
-  EXPECT_EQ(shorter.ubound(), pos);
-  const Bytes got = contents(shorter);
-  EXPECT_EQ(Bytes(got.begin(), got.begin() + 51), Bytes(51, 0xAA));
-  EXPECT_EQ(Bytes(got.begin() + 51, got.begin() + 100), Bytes(49, 0));
-  EXPECT_EQ(Bytes(got.begin() + 100, got.begin() + 1749), image);
-
-  // A longer array is cut; its spare byte keeps what it held, as it is never written.
-  ByteArray longer(0, 9999);
-  for (Byte& b : longer) b = 0xAA;
-  pos = 10;
-  EXPECT_TRUE(p->StreamOut(longer, pos));
-  EXPECT_EQ(longer.ubound(), 10 + 1649);
-  EXPECT_EQ(longer(9), 0xAA);
-  EXPECT_EQ(longer(10), 0x33);
-  EXPECT_EQ(longer(10 + 1649), 0xAA);
-
-  // An array from a file (lower bound 1) comes back from index 0, its bytes kept by index.
-  ByteArray from_file = stream_of(Bytes(10, 0xAA), 1);
-  pos = 11;
-  EXPECT_TRUE(p->StreamOut(from_file, pos));
-  EXPECT_EQ(from_file.lbound(), 0);
-  EXPECT_EQ(from_file(0), 0);
-  EXPECT_EQ(from_file(10), 0xAA);
-  EXPECT_EQ(from_file(11), 0x33);
-
-  // An array never given bounds is created from index 0.
-  ByteArray unbounded;
-  pos = 5;
-  EXPECT_TRUE(p->StreamOut(unbounded, pos));
-  EXPECT_EQ(unbounded.lbound(), 0);
-  EXPECT_EQ(unbounded.ubound(), 5 + 1649);
-  EXPECT_EQ(unbounded(4), 0);
-  EXPECT_EQ(unbounded(5), 0x33);
-}
-
-TEST(KVProfile, StreamOutRefusesPositionsWithoutRoomAndChangesNothing) {
-  LogCapture log;
-  auto p = source_profile();
-  for (const Long start :
-       {Long{-1}, std::numeric_limits<Long>::min(), Long{kLongMax - 1999}, kLongMax}) {
-    SCOPED_TRACE(start);
-    ByteArray stream = stream_of({1, 2, 3});
-    Long pos = start;
-    EXPECT_FALSE(p->StreamOut(stream, pos));
-    EXPECT_EQ(pos, start);
-    EXPECT_EQ(contents(stream), (Bytes{1, 2, 3}));
-    EXPECT_EQ(stream.lbound(), 0);
-  }
-  EXPECT_TRUE(log.entries.empty());
-}
-
 TEST(KVProfile, StreamLenIsWhatStreamOutWrites) {
   auto p = source_profile();
   p->ISN(u"ABC\u20AC");  // the euro sign takes one byte

@@ -73,44 +73,6 @@ TEST(KVTolerance, StreamImageIsTheRecordAndOneTrailingByte) {
   EXPECT_TRUE(HoldsAt(fresh, 0, std::vector<kvdata::Byte>(750, 0)));
 }
 
-TEST(KVTolerance, StreamOutOnlyGrowsAShortArray) {
-  // A longer array keeps its length and the bytes around the tolerance.
-  ByteArray longer(0, 999);
-  for (auto& b : longer) b = 0xEE;
-  Long pos = 10;
-  ASSERT_TRUE(sample_tolerance()->StreamOut(longer, pos));
-  EXPECT_EQ(pos, 759);
-  EXPECT_EQ(longer.ubound(), 999);
-  EXPECT_TRUE(HoldsAt(longer, 0, std::vector<kvdata::Byte>(10, 0xEE)));
-  EXPECT_TRUE(HoldsAt(longer, 10, sample_image()));
-  EXPECT_TRUE(HoldsAt(longer, 759, std::vector<kvdata::Byte>(241, 0xEE)));
-
-  // An array that ends exactly at Position + 749 is not grown.
-  ByteArray exact(0, 749);
-  pos = 0;
-  ASSERT_TRUE(sample_tolerance()->StreamOut(exact, pos));
-  EXPECT_EQ(exact.ubound(), 749);
-
-  // A shorter array grows to run from 0, keeping what it held at its indices.
-  ByteArray from_file(1, 3);
-  from_file(1) = 0x11;
-  from_file(2) = 0x22;
-  from_file(3) = 0x33;
-  pos = 3;
-  ASSERT_TRUE(sample_tolerance()->StreamOut(from_file, pos));
-  EXPECT_EQ(from_file.lbound(), 0);
-  EXPECT_EQ(from_file.ubound(), 752);
-  EXPECT_TRUE(HoldsAt(from_file, 0, {0x00, 0x11, 0x22}));
-  EXPECT_TRUE(HoldsAt(from_file, 3, sample_image()));
-
-  // An array that was never given bounds counts as empty.
-  ByteArray unbounded;
-  pos = 0;
-  ASSERT_TRUE(sample_tolerance()->StreamOut(unbounded, pos));
-  EXPECT_EQ(unbounded.lbound(), 0);
-  EXPECT_EQ(unbounded.ubound(), 749);
-}
-
 TEST(KVTolerance, StreamOutRaisesTheFailureWithItsStep) {
   ByteArray bytes(0, -1);
   Long pos = -1;
