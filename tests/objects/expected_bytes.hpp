@@ -1,43 +1,56 @@
 #pragma once
-// Expected stream images for the object tests, written out piece by piece
-// from the layout tables: literal bytes, and fixed-width text fields as their
-// UTF-16LE units followed by blank units (20 00).
+// Expected stream images for the object tests, read from the sections of
+// tests/data/object-images.txt (its header lists the tokens).
 //
-//   ExpectedBytes e;  e.bytes({0x05, 0x00, 0x00, 0x00});  e.text("dE", 50);
+//   const std::vector<kvdata::Byte> image = ImageFromData("user");
 
 #include <gtest/gtest.h>
 
 #include <cstddef>
-#include <initializer_list>
-#include <string_view>
+#include <fstream>
+#include <sstream>
+#include <string>
 #include <vector>
 
 #include "kvdata/automation/array.hpp"
 
-struct ExpectedBytes {
+inline std::vector<kvdata::Byte> ImageFromData(const std::string& section) {
+  std::ifstream in(std::string(KVDATA_SOURCE_DIR) + "/tests/data/object-images.txt");
   std::vector<kvdata::Byte> all;
-
-  ExpectedBytes& bytes(std::initializer_list<int> literal) {
-    for (int b : literal) all.push_back(static_cast<kvdata::Byte>(b));
-    return *this;
-  }
-  ExpectedBytes& zeros(std::size_t n) {
-    all.insert(all.end(), n, 0);
-    return *this;
-  }
-  // ASCII text as UTF-16LE units, then blank units up to `units`.
-  ExpectedBytes& text(std::string_view ascii, std::size_t units) {
-    for (std::size_t i = 0; i < units; ++i) {
-      all.push_back(i < ascii.size() ? static_cast<kvdata::Byte>(ascii[i]) : kvdata::Byte{0x20});
-      all.push_back(0);
+  bool inside = false;
+  for (std::string line; std::getline(in, line);) {
+    line = line.substr(0, line.find('#'));
+    if (!line.empty() && line[0] == '[') {
+      inside = line.substr(1, line.find(']') - 1) == section;
+      continue;
     }
-    return *this;
+    std::istringstream tokens(line);
+    for (std::string t; inside && tokens >> t;) {
+      std::size_t n = 0;
+      std::string word;
+      if (t == "zeros" && tokens >> n) {
+        all.insert(all.end(), n, 0);
+      } else if (t == "ascii" && tokens >> word) {
+        all.insert(all.end(), word.begin(), word.end());
+      } else if (t == "text" && tokens >> word >> n) {
+        if (word == "-") word.clear();
+        for (std::size_t i = 0; i < n; ++i) {
+          all.push_back(i < word.size() ? static_cast<kvdata::Byte>(word[i]) : kvdata::Byte{0x20});
+          all.push_back(0);
+        }
+      } else if (t == "units" && tokens >> word >> n) {
+        for (std::size_t i = 0; i < n; ++i) {
+          all.push_back(static_cast<kvdata::Byte>(std::stoi(word, nullptr, 16)));
+          all.push_back(0);
+        }
+      } else {
+        all.push_back(static_cast<kvdata::Byte>(std::stoi(t, nullptr, 16)));
+      }
+    }
   }
-  ExpectedBytes& append(const std::vector<kvdata::Byte>& more) {
-    all.insert(all.end(), more.begin(), more.end());
-    return *this;
-  }
-};
+  EXPECT_FALSE(all.empty()) << "no image [" << section << "]";
+  return all;
+}
 
 // Compares the elements at indices from .. from + expected.size() - 1,
 // reporting the first index that differs.

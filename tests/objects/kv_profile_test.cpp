@@ -10,6 +10,7 @@
 #include <vector>
 
 #include "kvdata/kvdata.hpp"
+#include "objects/expected_bytes.hpp"
 #include "objects/kv_profile_test_support.hpp"
 #include "support/error_number.hpp"
 
@@ -29,17 +30,9 @@ constexpr Long kLongMax = std::numeric_limits<Long>::max();
 constexpr eSC kSCE = eSC::SCE;
 constexpr eSC kSCI = eSC::SCI;
 
-// The stream of a new profile, typed out from its layout: stamp 1.4, three
-// zero Longs, the record stream (empty ISN, zero date, False, the type name,
-// 320 zero table values), 80 zero band-width values.
+// The stream of a new profile.
 Bytes new_profile_stream() {
-  Wire w;
-  w.raw({0x33, 0x33, 0xB3, 0x3F}).zeros(12);
-  w.raw({0x00, 0x00, 0x00, 0x00}).zeros(8).raw({0x00});
-  w.raw({0x10, 0x00, 0x00, 0x00}).raw({'t', 'O', 'V', 'P', 'r', 'o', 'f', 'i'});
-  w.raw({'l', 'e', 'D', 'a', 't', 'a', 'V', '1'});
-  w.zeros(1280).zeros(320);
-  return w.bytes;
+  return ImageFromData("new profile");
 }
 
 void patch(Bytes& bytes, std::size_t offset, std::initializer_list<int> values) {

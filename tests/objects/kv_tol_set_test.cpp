@@ -40,14 +40,6 @@ std::vector<Long> member_ids(const KVTolSet& set) {
   return ids;
 }
 
-// The 749-byte image of a tolerance that has only its ID and TolName set:
-// the other texts were never stored and stay zero.
-std::vector<kvdata::Byte> member_image(std::initializer_list<int> id, std::string_view name) {
-  ExpectedBytes e;
-  e.bytes(id).text(name, 50).zeros(510 + 2 + 32 + 100 + 1);
-  return e.all;
-}
-
 // A set with header ID 7, InstTypeID 3, CreateDate 2.0 and description
 // "Set", holding tolerances 5 ("A") and 9 ("B") under their IDs.
 std::shared_ptr<KVTolSet> two_member_set() {
@@ -63,17 +55,8 @@ std::shared_ptr<KVTolSet> two_member_set() {
 }
 
 TEST(KVTolSet, StreamIsTheHeaderThenEachMember) {
-  ExpectedBytes e;
-  e.bytes({0x07, 0x00, 0x00, 0x00})                             // ID
-      .bytes({0x03, 0x00, 0x00, 0x00})                          // InstTypeID
-      .bytes({0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0x40})  // CreateDate 2.0
-      .text("Set", 255)                                         // Description
-      .bytes({0x00, 0x00})                                      // gap
-      .bytes({0x02, 0x00, 0x00, 0x00})                          // member count
-      .bytes({0x00})                                            // trailing byte
-      .append(member_image({0x05, 0x00, 0x00, 0x00}, "A"))
-      .append(member_image({0x09, 0x00, 0x00, 0x00}, "B"));
-  ASSERT_EQ(e.all.size(), 2031u);
+  const std::vector<kvdata::Byte> image = ImageFromData("tolerance set");
+  ASSERT_EQ(image.size(), 2031u);
 
   auto set = two_member_set();
   ByteArray bytes(0, -1);
@@ -82,7 +65,7 @@ TEST(KVTolSet, StreamIsTheHeaderThenEachMember) {
   EXPECT_EQ(pos, 2031);
   EXPECT_EQ(bytes.lbound(), 0);
   EXPECT_EQ(bytes.ubound(), 2031);
-  EXPECT_TRUE(HoldsAt(bytes, 0, e.all));
+  EXPECT_TRUE(HoldsAt(bytes, 0, image));
   EXPECT_EQ(set->StreamLen(), 532 + 2 * 748);
 
   // Keys come back from the members' IDs, in stream order.

@@ -29,20 +29,9 @@ std::shared_ptr<KVTolerance> sample_tolerance() {
   return tol;
 }
 
-// The 749 bytes of sample_tolerance(), from the record layout.
+// The 749 bytes of sample_tolerance().
 std::vector<kvdata::Byte> sample_image() {
-  ExpectedBytes e;
-  e.bytes({0x05, 0x00, 0x00, 0x00})                             // ID
-      .text("dE", 50)                                           // TolName
-      .text("Max", 255)                                         // Description
-      .bytes({0x00, 0x00})                                      // gap
-      .bytes({0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0xF8, 0xBF})  // MinFail -1.5
-      .bytes({0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0xE0, 0x3F})  // MinWarn 0.5
-      .bytes({0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0xF0, 0x3F})  // MaxWarn 1.0
-      .bytes({0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0x40})  // MaxFail 2.0
-      .text("", 50)                                             // Misc
-      .bytes({0x00});                                           // trailing byte
-  return e.all;
+  return ImageFromData("tolerance");
 }
 
 TEST(KVTolerance, StreamImageIsTheRecordAndOneTrailingByte) {

@@ -32,21 +32,9 @@ tUser sample_user() {
   return u;  // RoleCode and Disabled empty
 }
 
-// The 848 bytes of sample_user(), from the user layout.
+// The 848 bytes of sample_user().
 std::vector<kvdata::Byte> sample_image() {
-  ExpectedBytes e;
-  e.bytes({0x9A, 0x99, 0x99, 0x3F})     // stamp 1.2
-      .text("ABCD", 30)                 // USERID
-      .bytes({0x04, 0x03, 0x02, 0x01})  // UserNumber
-      .text(std::string(50, 'L'), 50)   // LastName, cut
-      .text("Ann", 50)                  // FirstName
-      .text("pw", 30)                   // UserPWD
-      .text("a@b.c", 255)               // UserMail
-      .bytes({0x00, 0x00})              // gap
-      .bytes({0xFE, 0xFF, 0xFF, 0xFF})  // OrgID -2
-      .bytes({0x20, 0x00})              // RoleCode
-      .bytes({0x20, 0x00});             // Disabled
-  return e.all;
+  return ImageFromData("user");
 }
 
 std::shared_ptr<KVUser> sample() {
