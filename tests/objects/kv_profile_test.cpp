@@ -5,6 +5,7 @@
 #include <algorithm>
 #include <cstddef>
 #include <initializer_list>
+#include <iterator>
 #include <limits>
 #include <memory>
 #include <vector>
@@ -213,24 +214,38 @@ TEST(KVProfile, CorrectionIndicesOutsideTheTablesRaiseError9AndChangeNothing) {
   EXPECT_EQ(p->LinearCorrection(kSCI, 40), table_value(3, 1, 40));
 }
 
-TEST(KVProfile, StreamInRefusesAnyStampButOnePointFour) {
+// Another stamp, no bounds, a Position outside the stream: False, nothing read.
+TEST(KVProfile, StreamInRefusesStreamsItCannotReadAndChangesNothing) {
   LogCapture log;
-  Bytes bytes = encoding(*source_profile());
-  const std::vector<Bytes> stamps = {
-      {0x9A, 0x99, 0x99, 0x3F},  // 1.2
-      {0x34, 0x33, 0xB3, 0x3F},  // the Single next to 1.4
-      {0xCD, 0xCC, 0xCC, 0x3F},  // 1.6
+  const Bytes full = encoding(*source_profile());
+  auto stamped = [&](Bytes stamp) {
+    std::copy(full.begin() + 4, full.end(), std::back_inserter(stamp));
+    return stream_of(stamp);
   };
-  for (const Bytes& stamp : stamps) {
-    std::copy(stamp.begin(), stamp.end(), bytes.begin());
+  const struct {
+    const char* name;
+    ByteArray stream;
+    Long start, stop;
+    std::size_t logged;  // event-log entries
+  } cases[] = {
+      {"stamp 1.2", stamped({0x9A, 0x99, 0x99, 0x3F}), 0, 4, 0},
+      {"the Single next to 1.4", stamped({0x34, 0x33, 0xB3, 0x3F}), 0, 4, 0},
+      {"stamp 1.6", stamped({0xCD, 0xCC, 0xCC, 0x3F}), 0, 4, 0},
+      {"no bounds", ByteArray{}, 0, 0, 1},
+      {"negative Position", stream_of(full), -3, -3, 1},
+      {"Position near the top", stream_of(full), kLongMax - 1, kLongMax - 1, 1},
+  };
+  for (const auto& c : cases) {
+    SCOPED_TRACE(c.name);
     auto p = old_profile();
     const Bytes before = encoding(*p);
-    Long pos = 0;
-    EXPECT_FALSE(p->StreamIn(stream_of(bytes), pos));
-    EXPECT_EQ(pos, 4);
+    Long pos = c.start;
+    EXPECT_FALSE(p->StreamIn(c.stream, pos));
+    EXPECT_EQ(pos, c.stop);
     EXPECT_EQ(encoding(*p), before);
+    EXPECT_EQ(log.entries.size(), c.logged);
+    log.entries.clear();
   }
-  EXPECT_TRUE(log.entries.empty());
 }
 
 TEST(KVProfile, EveryTruncationGivesFalseWithWhatWasReadBeforeIt) {
@@ -308,24 +323,10 @@ TEST(KVProfile, AnotherTypeNameStopsBeforeTheBandWidthValues) {
   EXPECT_TRUE(log.entries.empty());
 }
 
-TEST(KVProfile, StreamInIsSafeOnStreamsItCannotRead) {
-  LogCapture log;
+TEST(KVProfile, StreamInFromAFileStreamStartsAtIndexOne) {
   const Bytes full = encoding(*source_profile());
   auto p = old_profile();
-  const Bytes before = encoding(*p);
-  ByteArray unbounded;
-  Long pos = 0;
-  EXPECT_FALSE(p->StreamIn(unbounded, pos));
-  pos = -3;
-  EXPECT_FALSE(p->StreamIn(stream_of(full), pos));
-  EXPECT_EQ(pos, -3);
-  pos = kLongMax - 1;
-  EXPECT_FALSE(p->StreamIn(stream_of(full), pos));
-  EXPECT_EQ(pos, kLongMax - 1);
-  EXPECT_EQ(encoding(*p), before);
-
-  // A stream loaded from a file runs from index 1.
-  pos = 1;
+  Long pos = 1;
   EXPECT_TRUE(p->StreamIn(stream_of(full, 1), pos));
   EXPECT_EQ(pos, 1 + 1653);
   EXPECT_EQ(p->ISN(), u"SN-7");
