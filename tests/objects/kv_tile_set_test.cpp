@@ -2,6 +2,9 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
+#include <functional>
+
 #include <memory>
 
 #include "kv_tile_test_support.hpp"
@@ -172,93 +175,71 @@ Bytes tile_set_stream(int blocks) {
   return out;
 }
 
+// StreamIn reads the TSN, then one block per element of Tiles, whatever its
+// bounds; only elements 1 to 13 are stored.
 TEST(KVTileSet, StreamInReadsTsnAndOneBlockPerElement) {
-  auto set = filled_set();
-  ByteArray whole = array_at(0, tile_set_stream(13));
-  Long position = 0;
-  ASSERT_TRUE(set->StreamIn(whole, position));
-  EXPECT_EQ(position, 7 + 13 * 264);
-  const tTileSet read = set->v1TileSet();
-  EXPECT_EQ(read.TSN, u"TS1");
-  EXPECT_EQ(read.Tiles(1).Name, u"A");
-  EXPECT_EQ(read.Tiles(13), tile_def(u"M", 13, 0.0f));
-
-  set = filled_set();
-  const tTileSet before = set->v1TileSet();
-
-  // Bounds 1 to 3: exactly three blocks are read.
-  tTileSet three = before;
-  three.Tiles.redim_preserve(1, 3);
-  set->v1TileSet(three);
-  position = 0;
-  ASSERT_TRUE(set->StreamIn(whole, position));
-  EXPECT_EQ(position, 7 + 3 * 264);
-  EXPECT_EQ(set->v1TileSet().Tiles(3).Name, u"C");
-
-  // Bounds 0 to 14: fifteen blocks are read, element 0 and 14 are not stored.
-  tTileSet wide = before;
-  wide.Tiles.redim_preserve(0, 14);
-  set->v1TileSet(wide);
-  ByteArray fifteen = array_at(0, tile_set_stream(15));
-  position = 0;
-  ASSERT_TRUE(set->StreamIn(fifteen, position));
-  EXPECT_EQ(position, 7 + 15 * 264);
-  EXPECT_EQ(set->v1TileSet().Tiles(0), tTileDef{});
-  EXPECT_EQ(set->v1TileSet().Tiles(1).Name, u"B");
-  EXPECT_EQ(set->v1TileSet().Tiles(13).Name, u"N");
-  EXPECT_EQ(set->v1TileSet().Tiles(14), tTileDef{});
-
-  // No bounds: TSN is read, then the read fails.
-  tTileSet unbounded;
-  set->v1TileSet(unbounded);
-  position = 0;
-  EXPECT_FALSE(set->StreamIn(whole, position));
-  EXPECT_EQ(position, 7);
-  EXPECT_EQ(set->TSN(), u"TS1");
-}
-
-TEST(KVTileSet, StreamInStopsAtADamagedTsn) {
-  LogCapture log;
-  auto set = filled_set();
-  const tTileSet before = set->v1TileSet();
-
-  // The count says 66536 but far fewer bytes follow: no tile is read from there.
   Bytes damaged = tile_set_stream(13);
-  damaged[0] = 0xE8;
+  damaged[0] = 0xE8;  // a TSN count of 66536, far more than follow
   damaged[1] = 0x03;
   damaged[2] = 0x01;
-  ByteArray bytes = array_at(0, damaged);
-  Long position = 0;
-  EXPECT_FALSE(set->StreamIn(bytes, position));
-  EXPECT_EQ(position, 4);
-  EXPECT_EQ(set->v1TileSet(), before);
-
-  // Fewer than four bytes: the TSN stays as it was.
-  ByteArray tiny = array_at(0, {0x03, 0x00});
-  position = 0;
-  EXPECT_FALSE(set->StreamIn(tiny, position));
-  EXPECT_EQ(position, 0);
-  EXPECT_EQ(set->v1TileSet(), before);
-  EXPECT_EQ(log.entries.size(), 2u);
-}
-
-TEST(KVTileSet, StreamInWithHugeBoundsStopsWhenBytesRunOut) {
-  auto set = KVTileSet::create();
-  tTileSet record;
-  record.Tiles.redim(1, 50000);
-  set->v1TileSet(record);
-  ByteArray bytes = array_at(0, tile_set_stream(2));
-  Long position = 0;
-  EXPECT_FALSE(set->StreamIn(bytes, position));
-  EXPECT_EQ(position, 7 + 2 * 264);
-  EXPECT_EQ(set->Tiles(2)->ColorName(), u"B");
-
-  // Tile indexes are Integers: elements beyond their range cannot be addressed.
-  record.Tiles.redim(-40000, -39999);
-  set->v1TileSet(record);
-  position = 0;
-  EXPECT_FALSE(set->StreamIn(bytes, position));
-  EXPECT_EQ(position, 7);
+  using Check = std::function<void(const tTileSet&)>;
+  const struct {
+    const char* name;
+    bool bounded;
+    Long lower, upper;
+    Bytes stream;
+    bool result;
+    Long stop;
+    std::size_t logged;
+    Check check;  // nothing: the record is unchanged
+  } cases[] = {
+      {"1 to 13", true, 1, 13, tile_set_stream(13), true, 7 + 13 * 264, 0,
+       [](const tTileSet& r) {
+         EXPECT_EQ(r.TSN, u"TS1");
+         EXPECT_EQ(r.Tiles(1).Name, u"A");
+         EXPECT_EQ(r.Tiles(13), tile_def(u"M", 13, 0.0f));
+       }},
+      {"1 to 3: exactly three blocks", true, 1, 3, tile_set_stream(13), true, 7 + 3 * 264, 0,
+       [](const tTileSet& r) { EXPECT_EQ(r.Tiles(3).Name, u"C"); }},
+      {"0 to 14: elements 0 and 14 not stored", true, 0, 14, tile_set_stream(15), true,
+       7 + 15 * 264, 0,
+       [](const tTileSet& r) {
+         EXPECT_EQ(r.Tiles(0), tTileDef{});
+         EXPECT_EQ(r.Tiles(1).Name, u"B");
+         EXPECT_EQ(r.Tiles(13).Name, u"N");
+         EXPECT_EQ(r.Tiles(14), tTileDef{});
+       }},
+      {"no bounds: the TSN, then the read fails", false, 0, 0, tile_set_stream(13), false, 7, 0,
+       [](const tTileSet& r) { EXPECT_EQ(r.TSN, u"TS1"); }},
+      {"1 to 50000: stops when the bytes run out", true, 1, 50000, tile_set_stream(2), false,
+       7 + 2 * 264, 0, [](const tTileSet& r) { EXPECT_EQ(r.Tiles(2).Name, u"B"); }},
+      // Tile indexes are Integers: elements beyond their range cannot be addressed.
+      {"beyond the Integer range", true, -40000, -39999, tile_set_stream(2), false, 7, 0,
+       [](const tTileSet& r) { EXPECT_EQ(r.TSN, u"TS1"); }},
+      {"damaged TSN", true, 1, 13, damaged, false, 4, 1, nullptr},
+      {"fewer than four bytes", true, 1, 13, {0x03, 0x00}, false, 0, 1, nullptr},
+  };
+  for (const auto& c : cases) {
+    SCOPED_TRACE(c.name);
+    LogCapture log;
+    auto set = filled_set();
+    tTileSet record = set->v1TileSet();
+    record.Tiles = {};
+    if (c.bounded) record.Tiles.redim(c.lower, c.upper);
+    for (Long i = std::max<Long>(c.lower, 1); c.bounded && i <= std::min<Long>(c.upper, 13); ++i) {
+      record.Tiles(i) = set->v1TileSet().Tiles(i);
+    }
+    set->v1TileSet(record);
+    Long position = 0;
+    EXPECT_EQ(set->StreamIn(array_at(0, c.stream), position), c.result);
+    EXPECT_EQ(position, c.stop);
+    EXPECT_EQ(log.entries.size(), c.logged);
+    if (c.check) {
+      c.check(set->v1TileSet());
+    } else {
+      EXPECT_EQ(set->v1TileSet(), record);
+    }
+  }
 }
 
 TEST(KVTileSet, StreamOutRoundTrip) {
