@@ -210,11 +210,6 @@ TEST(KVCalibration, StreamOutRoundTrip) {
   EXPECT_EQ(read, position);
   EXPECT_EQ(copy->v1Calibration(), cal->v1Calibration());
   EXPECT_EQ(copy->TSN(), cal->TSN());
-
-  Long negative = -2;
-  EXPECT_FALSE(cal->StreamOut(bytes, negative));
-  EXPECT_EQ(negative, -2);
-  EXPECT_EQ(bytes.ubound(), 3 + 4188);
 }
 
 TEST(KVCalibration, TilesKeepTheirCalibrationAlive) {

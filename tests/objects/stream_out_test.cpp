@@ -42,6 +42,17 @@ std::shared_ptr<IKVStream> tolerance() {
   t->TolName(u"dE");
   return t;
 }
+std::shared_ptr<IKVStream> tile_set() {
+  auto s = KVTileSet::create();
+  s->TSN(u"TS-042");
+  s->Tiles(2)->ColorRGB(1000);
+  return s;
+}
+std::shared_ptr<IKVStream> calibration() {
+  auto c = KVCalibration::create();
+  c->Tiles(7)->SCWL(eSC::SCI, 10, 12.5);
+  return c;
+}
 std::shared_ptr<IKVStream> user() {
   return KVUser::create();
 }
@@ -70,6 +81,8 @@ const std::vector<Case>& cases() {
       {"tolerance", tolerance, true, true, kLongMax - 100, true, 1},
       {"user", user, false, false, kLongMax - 847},
       {"tile", tile, false, false, kLongMax - 100},
+      {"tile set", tile_set, false, false, kLongMax - 100},
+      {"calibration", calibration, false, false, kLongMax - 100},
   };
   return all;
 }
