@@ -129,8 +129,6 @@ TEST(KVTestRun, StreamStartsWithTheVersionAndEndsWithTheLightLevelData) {
   Long pos = 0;
   EXPECT_TRUE(run->StreamOut(stream, pos));
   EXPECT_EQ(pos, 524);
-  EXPECT_EQ(stream.lbound(), 0);
-  EXPECT_EQ(stream.ubound(), 524);  // one spare byte after the encoding
   EXPECT_EQ(prefix(contents(stream), 524), w.bytes);
   EXPECT_EQ(run->StreamLen(), 524);
 
@@ -150,7 +148,6 @@ TEST(KVTestRun, RoundTripIntoAFreshObject) {
   Long pos = 3;
   EXPECT_TRUE(run->StreamOut(stream, pos));
   EXPECT_EQ(pos, 3 + static_cast<Long>(written.size()));
-  EXPECT_EQ(stream(2), 0xEE);
 
   auto fresh = KVTestRun::create();
   Long in = 3;
