@@ -13,7 +13,7 @@
 #include <vector>
 
 #include "kvdata/kvdata.hpp"
-#include "objects/kv_profile_test_support.hpp"
+#include "support/streams.hpp"
 
 namespace {
 
@@ -37,10 +37,10 @@ using kvdata::String;
 using kvdata::tTileSet;
 using kvdata::tUser;
 using kvdata::Variant;
-using kvdata::profile_testing::encoding;
-using kvdata::profile_testing::LogCapture;
-using kvdata::profile_testing::prefix;
-using kvdata::profile_testing::stream_of;
+using kvdata::testing::encoding;
+using kvdata::testing::LogCapture;
+using kvdata::testing::prefix;
+using kvdata::testing::stream_of;
 
 constexpr Long kLongMin = std::numeric_limits<Long>::min();
 constexpr Long kLongMax = std::numeric_limits<Long>::max();

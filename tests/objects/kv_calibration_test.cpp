@@ -4,17 +4,18 @@
 
 #include <memory>
 
-#include "kv_tile_test_support.hpp"
 #include "kvdata/objects/kv_cal_tile.hpp"
+#include "support/error_number.hpp"
+#include "support/streams.hpp"
 
 namespace kvdata {
 namespace {
 
-using testing::array_at;
 using testing::Bytes;
 using testing::cat;
 using testing::error_number;
 using testing::slice;
+using testing::stream_of;
 using testing::units;
 
 // An IKVCalTile that is not a KVCalTile.
@@ -185,7 +186,7 @@ TEST(KVCalibration, StreamInReadsTheWholeBlockOrNothing) {
 
   // Exactly 4188 bytes, from a stream that starts at index 1.
   auto cal = KVCalibration::create();
-  ByteArray exact = array_at(1, block);
+  ByteArray exact = stream_of(block, 1);
   Long position = 1;
   ASSERT_TRUE(cal->StreamIn(exact, position));
   EXPECT_EQ(position, 4189);
@@ -196,7 +197,7 @@ TEST(KVCalibration, StreamInReadsTheWholeBlockOrNothing) {
 TEST(KVCalibration, StreamOutRoundTrip) {
   auto cal = KVCalibration::create();
   cal->v1Calibration(filled_record());
-  ByteArray bytes = array_at(1, Bytes(10, 0xAA));  // a stream loaded from a file
+  ByteArray bytes = stream_of(Bytes(10, 0xAA), 1);  // a stream loaded from a file
   Long position = 3;
   ASSERT_TRUE(cal->StreamOut(bytes, position));
   EXPECT_EQ(position, 3 + 4188);

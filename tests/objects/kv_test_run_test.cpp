@@ -8,18 +8,18 @@
 #include <memory>
 
 #include "kvdata/kvdata.hpp"
-#include "objects/kv_profile_test_support.hpp"
+#include "support/streams.hpp"
 
 namespace kvdata {
 namespace {
 
-using profile_testing::Bytes;
-using profile_testing::contents;
-using profile_testing::encoding;
-using profile_testing::LogCapture;
-using profile_testing::prefix;
-using profile_testing::stream_of;
-using profile_testing::Wire;
+using testing::Bytes;
+using testing::contents;
+using testing::encoding;
+using testing::LogCapture;
+using testing::prefix;
+using testing::stream_of;
+using testing::Wire;
 
 constexpr Long kLongMax = std::numeric_limits<Long>::max();
 

@@ -7,18 +7,19 @@
 
 #include <memory>
 
-#include "kv_tile_test_support.hpp"
 #include "kvdata/objects/kv_tile.hpp"
+#include "support/error_number.hpp"
+#include "support/streams.hpp"
 
 namespace kvdata {
 namespace {
 
-using testing::array_at;
 using testing::Bytes;
 using testing::cat;
 using testing::error_number;
 using testing::LogCapture;
 using testing::slice;
+using testing::stream_of;
 using testing::units;
 
 // An IKVTile that is not a KVTile.
@@ -231,7 +232,7 @@ TEST(KVTileSet, StreamInReadsTsnAndOneBlockPerElement) {
     }
     set->v1TileSet(record);
     Long position = 0;
-    EXPECT_EQ(set->StreamIn(array_at(0, c.stream), position), c.result);
+    EXPECT_EQ(set->StreamIn(stream_of(c.stream), position), c.result);
     EXPECT_EQ(position, c.stop);
     EXPECT_EQ(log.entries.size(), c.logged);
     if (c.check) {
@@ -244,7 +245,7 @@ TEST(KVTileSet, StreamInReadsTsnAndOneBlockPerElement) {
 
 TEST(KVTileSet, StreamOutRoundTrip) {
   auto set = filled_set();
-  ByteArray bytes = array_at(0, Bytes(5000, 0xAA));
+  ByteArray bytes = stream_of(Bytes(5000, 0xAA));
   Long position = 3;
   ASSERT_TRUE(set->StreamOut(bytes, position));
   const Long length = 4 + 6 + 13 * 264;

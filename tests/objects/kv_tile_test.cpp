@@ -5,16 +5,17 @@
 #include <cmath>
 #include <limits>
 
-#include "kv_tile_test_support.hpp"
+#include "support/error_number.hpp"
+#include "support/streams.hpp"
 
 namespace kvdata {
 namespace {
 
-using testing::array_at;
 using testing::Bytes;
 using testing::cat;
 using testing::error_number;
 using testing::slice;
+using testing::stream_of;
 using testing::units;
 
 TEST(KVTile, NewTileIsAllZeroAndStreamsAsZeroBlock) {
@@ -119,7 +120,7 @@ TEST(KVTile, StreamInReadsTheBlockOrNothing) {
 
   auto tile = KVTile::create();
   tile->Order(7);
-  ByteArray bytes = array_at(1, cat({{0x99}, block}));  // loaded from a file: index 1 first
+  ByteArray bytes = stream_of(cat({{0x99}, block}), 1);  // loaded from a file: index 1 first
   Long position = 2;
   ASSERT_TRUE(tile->StreamIn(bytes, position));
   EXPECT_EQ(position, 266);
@@ -140,7 +141,7 @@ TEST(KVTile, StreamInReadsTheBlockOrNothing) {
   };
   for (const Case c : {Case{0, 263, 0, 263}, Case{0, 150, 50, 100}, Case{0, 10, 11, 0},
                        Case{1, 300, 0, 0}, Case{0, 300, -5, 0}}) {
-    ByteArray short_bytes = array_at(c.lower, Bytes(static_cast<std::size_t>(c.size), 0x41));
+    ByteArray short_bytes = stream_of(Bytes(static_cast<std::size_t>(c.size), 0x41), c.lower);
     Long pos = c.position;
     EXPECT_FALSE(tile->StreamIn(short_bytes, pos)) << c.size << " at " << c.position;
     EXPECT_EQ(pos, c.position + c.moved);

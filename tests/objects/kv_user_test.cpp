@@ -10,7 +10,7 @@
 #include "kvdata/foundation/ikv_db_object.hpp"
 #include "kvdata/foundation/ikv_security.hpp"
 #include "objects/expected_bytes.hpp"
-#include "objects/kv_profile_test_support.hpp"
+#include "support/streams.hpp"
 
 namespace {
 
@@ -43,7 +43,7 @@ std::shared_ptr<KVUser> sample() {
   return user;
 }
 
-using kvdata::profile_testing::LogCapture;
+using kvdata::testing::LogCapture;
 
 TEST(KVUser, StreamIsTheStampAndTheBlockWithOneSpareByte) {
   const auto expected = sample_image();

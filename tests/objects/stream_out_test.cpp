@@ -10,14 +10,14 @@
 
 #include "kvdata/automation/error.hpp"
 #include "kvdata/kvdata.hpp"
-#include "objects/kv_profile_test_support.hpp"
+#include "support/streams.hpp"
 
 namespace kvdata {
 namespace {
 
-using profile_testing::Bytes;
-using profile_testing::encoding;
-using profile_testing::LogCapture;
+using testing::Bytes;
+using testing::encoding;
+using testing::LogCapture;
 
 constexpr Long kLongMax = std::numeric_limits<Long>::max();
 constexpr Long kLongMin = std::numeric_limits<Long>::min();

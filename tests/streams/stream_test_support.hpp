@@ -1,11 +1,7 @@
 #pragma once
-// Test support for the stream tests: collecting event-log entries, a
-// reference encoder that lays out expected bytes value by value (as a
-// layout table reads, independent of the library's own encoder), and
-// the largest allocation made while a piece of code runs.
-//
-//   LogCapture log;   ...   EXPECT_EQ(log.entries.size(), 1u);
-//   Wire w;  w.l32(1).str("abc");   // 01 00 00 00 03 00 00 00 61 62 63
+// Test support for the stream tests: sample records with a distinct value in
+// every field, their expected images, and the largest allocation made while a
+// piece of code runs. Byte builders and log capture: support/streams.hpp.
 
 #include <algorithm>
 #include <bit>
@@ -17,72 +13,9 @@
 #include <vector>
 
 #include "kvdata/kvdata.hpp"
+#include "support/streams.hpp"
 
 namespace kvdata::testing {
-
-class LogCapture {
- public:
-  LogCapture() {
-    previous_ = EventLog::SetSink([this](const String& text) { entries.push_back(text); });
-  }
-  ~LogCapture() { EventLog::SetSink(previous_); }
-  LogCapture(const LogCapture&) = delete;
-  LogCapture& operator=(const LogCapture&) = delete;
-
-  std::vector<String> entries;
-
- private:
-  EventLog::Sink previous_;
-};
-
-// Expected stream bytes, built by hand: each call appends one value's
-// little-endian image.
-struct Wire {
-  std::vector<Byte> bytes;
-
-  Wire& raw(std::initializer_list<int> values) {
-    for (int v : values) bytes.push_back(static_cast<Byte>(v));
-    return *this;
-  }
-  Wire& le(std::uint64_t bits, int width) {
-    for (int i = 0; i < width; ++i) bytes.push_back(static_cast<Byte>(bits >> (8 * i)));
-    return *this;
-  }
-  Wire& i16(std::int16_t v) { return le(static_cast<std::uint16_t>(v), 2); }
-  Wire& l32(std::int32_t v) { return le(static_cast<std::uint32_t>(v), 4); }
-  Wire& f32(float v) { return le(std::bit_cast<std::uint32_t>(v), 4); }
-  Wire& f64(double v) { return le(std::bit_cast<std::uint64_t>(v), 8); }
-  Wire& boolean(bool v) { return raw({v ? 1 : 0}); }
-  // Text of one-byte characters: the count, then the bytes.
-  Wire& str(std::string_view text) {
-    l32(static_cast<std::int32_t>(text.size()));
-    for (char c : text) bytes.push_back(static_cast<Byte>(c));
-    return *this;
-  }
-  // UTF-16 code units, little-endian.
-  Wire& units(std::u16string_view text) {
-    for (char16_t c : text) le(c, 2);
-    return *this;
-  }
-  Wire& zeros(std::size_t n) {
-    bytes.insert(bytes.end(), n, Byte{0});
-    return *this;
-  }
-  std::size_t size() const { return bytes.size(); }
-};
-
-// The elements of a stream from lower to upper bound.
-inline std::vector<Byte> contents(const ByteArray& stream) {
-  return std::vector<Byte>(stream.begin(), stream.end());
-}
-
-// A stream with lower bound `lower` holding `bytes` (its upper bound may be
-// the highest Long).
-inline ByteArray stream_of(const std::vector<Byte>& bytes, Long lower = 0) {
-  ByteArray stream(lower, lower + (static_cast<Long>(bytes.size()) - 1));
-  std::copy(bytes.begin(), bytes.end(), stream.begin());
-  return stream;
-}
 
 // A spectrum whose 40 values are distinct and exact: base + band / 4.
 inline tSpectrum spectrum(float base) {
