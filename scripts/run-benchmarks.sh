@@ -5,7 +5,9 @@
 # this one run. The command runs on KVDATA_BENCH_SPECTRA spectra and on a
 # tenth of that (peak memory must not grow), and its CPU time is split into
 # reading, colour work and writing with the suite's command/csv/* phases.
-# bench/NOTES.md (the profiles behind the figures) is appended.
+# The Python module's batch colour is set against the C++ batch entry point
+# on a million spectra, the two run in turns. bench/NOTES.md (the profiles
+# behind the figures) is appended.
 #
 #   ./scripts/run-benchmarks.sh                      # 5 repetitions, 1 000 000 spectra
 #   KVDATA_BENCH_REPETITIONS=9 ./scripts/run-benchmarks.sh
@@ -35,7 +37,8 @@ if ! command -v spec2cie >/dev/null; then
   (apt-get install -y argyll || (apt-get update && apt-get install -y argyll)) >&2 ||
     echo "run-benchmarks: argyll could not be installed; the peer figures are left out" >&2
 fi
-cmake --preset release >/dev/null
+# The release build also makes the Python module, for its benchmark.
+cmake --preset release -DKVDATA_BUILD_PYTHON=ON >/dev/null
 cmake --build --preset release -j2
 
 bench_bin=build/release/bench/kvdata_bench
@@ -260,6 +263,25 @@ if [ -x "$kvdata_bin" ] && [ -x "$make_test_run" ] && declare -f timed >/dev/nul
     stream_rows+="| \`kvdata $args\` | $wall s | $cpu s | $((rss / 1024)) MB | $(verdict "$rss" "$stream_bound_kb") |"$'\n'
   done
 fi
+# --- the Python module's batch colour against the C++ entry point -----------------
+# In turns, once per repetition: the C++ benchmark on a million spectra, then
+# the Python function on as many of the same kind, so that a change in the
+# machine's load hits both alike. Medians of spectra per CPU second.
+python_rate=""
+python_package=build/release/python/kvdata
+if [ -d "$python_package" ] && [[ "colour/spectra_1M/batch" =~ $filter ]]; then
+  echo "== Python batch colour against the C++ batch entry point" >&2
+  for _ in $(seq "$repetitions"); do
+    "$bench_bin" --benchmark_filter='^colour/spectra_1M/batch$' --benchmark_min_time="$min_time" \
+      --benchmark_format=json | jq -r '.benchmarks[0].items_per_second' >>"$work/cpp_1m"
+    PYTHONPATH=build/release/python /usr/bin/python3 bench/python_colour.py 1000000 "$min_time" |
+      jq -r '.items_per_second' >>"$work/python_1m"
+  done
+  median() { sort -g "$1" | awk '{ v[NR] = $1 } END { print (NR % 2) ? v[(NR + 1) / 2] : (v[NR / 2] + v[NR / 2 + 1]) / 2 }'; }
+  cpp_rate=$(median "$work/cpp_1m")
+  python_rate=$(median "$work/python_1m")
+  python_share=$(awk -v p="$python_rate" -v c="$cpp_rate" 'BEGIN { printf "%.2f", p / c }')
+fi
 load_after="$(cut -d' ' -f1-3 /proc/loadavg)"
 
 # --- RESULTS.md -------------------------------------------------------------------
@@ -353,6 +375,21 @@ host_wall_ratio="$(jq -r 'map(.real_time / .cpu_time) | add / length' "$work/med
     echo "| calcLAB / cmsXYZ2Lab, time per conversion | $(ratio colour/xyz_to_lab/calcLAB colour/xyz_to_lab/lcms_cmsXYZ2Lab) |"
     echo "| batch (spectrum to XYZ and CIELAB) / cmsXYZ2Lab (XYZ to CIELAB only), time per spectrum | $(ratio colour/spectra/batch colour/xyz_to_lab/lcms_cmsXYZ2Lab) |"
     echo "| Deltas / cmsDeltaE, time per difference | $(ratio colour/delta_e/Deltas colour/delta_e/lcms_cmsDeltaE) |"
+    echo
+  fi
+  if [ -n "$python_rate" ]; then
+    echo "## Python: \`kvdata.calc_xyz_lab_d6510\` against the C++ entry point"
+    echo
+    echo "A million spectra of percent reflectance (random walks as above) each way; the two run in"
+    echo "turns, $repetitions times, and each figure is the median. The C++ entry point writes into"
+    echo "output it reuses; the Python function takes a C-contiguous float32 NumPy array (no copy)"
+    echo "and makes its two N x 3 outputs on every call. Millions of spectra per CPU second, one core."
+    echo
+    echo "| | M spectra/s |"
+    echo "|---|---|"
+    echo "| C++ \`calc_xyz_lab_d6510\` (\`colour/spectra_1M/batch\`) | $(awk -v r="$cpp_rate" 'BEGIN { printf "%.2f", r / 1e6 }') |"
+    echo "| Python \`kvdata.calc_xyz_lab_d6510\` (\`bench/python_colour.py\`) | $(awk -v r="$python_rate" 'BEGIN { printf "%.2f", r / 1e6 }') |"
+    echo "| Python / C++ (target >= 0.90) | $python_share ($(verdict "$python_share" 0.90 ge)) |"
     echo
   fi
   if has stats/spread_1000x40/calculate; then

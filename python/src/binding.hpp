@@ -8,8 +8,10 @@
 
 #include <pybind11/pybind11.h>
 
+#include <functional>
 #include <memory>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "kvdata/kvdata.hpp"
@@ -27,6 +29,31 @@ struct PyByteArray {
 
   // Raises BufferError while a buffer is held on the array.
   void check_resizable() const;
+};
+
+// A value Python holds: its own (a record made or copied in Python, an
+// object's property) or one inside another such value, found again at every
+// use by the path that reached it. An element of a dynamic array is found
+// by its index, so after the array is redimensioned or replaced the element
+// is whatever now has that index, and raises IndexError (error 9) when the
+// index is gone; it never refers to storage the array has given up. Each
+// place keeps the storage of the value it lies in alive.
+template <class T>
+struct Ref {
+  std::function<T&()> at;
+
+  T& get() const { return at(); }
+
+  static Ref own(T value) {
+    auto held = std::make_shared<T>(std::move(value));
+    return {[held]() -> T& { return *held; }};
+  }
+  // The place `step(value)` inside this one.
+  template <class Step>
+  auto inner(Step step) const {
+    using U = std::remove_reference_t<decltype(step(std::declval<T&>()))>;
+    return Ref<U>{[outer = at, step]() -> U& { return step(outer()); }};
+  }
 };
 
 // The bytes a stream member reads: a kvdata.ByteArray itself (not copied) or
@@ -76,3 +103,37 @@ void bind_colour(py::module_& m);
 void bind_stats(py::module_& m);
 
 }  // namespace kvdata::python
+
+// Records cross between C++ and Python as the Python class of their Ref: a
+// record given to Python becomes a Python value of its own (a copy), and a
+// C++ function taking a record by reference works on the place the Python
+// value refers to.
+namespace pybind11::detail {
+
+template <class R>
+class type_caster<R, std::enable_if_t<kvdata::DescribedRecord<R>>>
+    : public type_caster_base<kvdata::python::Ref<R>> {
+  using Ref = kvdata::python::Ref<R>;
+  using Base = type_caster_base<Ref>;
+
+ public:
+  static constexpr auto name = const_name<Ref>();
+  template <class T>
+  using cast_op_type = pybind11::detail::cast_op_type<T>;
+
+  operator R&() { return static_cast<Ref&>(static_cast<Base&>(*this)).get(); }
+  operator R*() { return &static_cast<R&>(*this); }
+
+  static handle cast(const R& value, return_value_policy, handle parent) {
+    return Base::cast(Ref::own(value), return_value_policy::move, parent);
+  }
+  static handle cast(R&& value, return_value_policy, handle parent) {
+    return Base::cast(Ref::own(std::move(value)), return_value_policy::move, parent);
+  }
+  static handle cast(const R* value, return_value_policy policy, handle parent) {
+    if (value == nullptr) return none().release();
+    return cast(*value, policy, parent);
+  }
+};
+
+}  // namespace pybind11::detail

@@ -34,16 +34,59 @@ std::shared_ptr<C> from_bytes(const py::handle& data) {
   return object;
 }
 
-// The properties the object streams, as its description lists them.
+// How many indices reach a single value of T: 2 for a table of spectra by
+// eSC and band.
+template <class T>
+constexpr std::size_t index_depth() {
+  if constexpr (kFixed<T> || kDynamic<T>) {
+    return 1 + index_depth<typename T::value_type>();
+  } else if constexpr (DescribedRecord<T>) {
+    if constexpr (cli::kStandsForArray<T>) {
+      using Fields = std::remove_cvref_t<decltype(RecordDescription<T>::kFields)>;
+      return index_depth<typename std::tuple_element_t<0, Fields>::member_type>();
+    } else {
+      return 0;
+    }
+  } else {
+    return 0;
+  }
+}
+
+// The interface's indexed member of a fixed-array property, on the object
+// `o`: called with the indices it gives one value, with the indices and a
+// value it stores that value (the whole property written back), each time
+// on the object's value of the moment. An index out of range raises error
+// 9 and changes nothing.
+template <class P, class O>
+py::object indexed_member(const P& p, O& o, const py::args& args) {
+  using T = typename P::value_type;
+  constexpr std::size_t depth = index_depth<T>();
+  if (args.size() != depth && args.size() != depth + 1) {
+    throw py::type_error(std::string(p.name) + " takes " + std::to_string(depth) +
+                         " indices, and a value to store");
+  }
+  const auto value = Ref<T>::own(p.get(o));
+  py::object at = value_out<typename P::index_type>(value);
+  for (std::size_t k = 0; k + 1 < depth; ++k) at = at[py::object(args[k])];
+  const py::object last = args[depth - 1];
+  if (args.size() == depth) return at[last];
+  at[last] = py::object(args[depth]);
+  p.set(o, value.get());
+  return py::none();
+}
+
+// The properties the object streams, as its description lists them, on the
+// Python class of the description's Interface.
 template <class C, class Cls>
 void add_described_properties(Cls& cls) {
   for_each_property<C>([&](const auto& p) {
     using P = std::remove_cvref_t<decltype(p)>;
+    using O = typename P::object_type;
     const std::string name(p.name);
     if constexpr (requires { p.members; }) {
       cls.def_property_readonly(
           name.c_str(),
-          [p](const C& o) {
+          [p](const O& o) {
             py::list out;
             for (const auto& member : p.members(o)) out.append(py::cast(member));
             return out;
@@ -52,16 +95,30 @@ void add_described_properties(Cls& cls) {
     } else {
       using T = typename P::value_type;
       using Index = typename P::index_type;
-      const std::string doc =
-          type_name<T>() + ". Reading gives a copy; assign the whole value to change it.";
-      cls.def_property(
-          name.c_str(), [p](const C& o) { return value_copy_out<Index>(p.get(o)); },
-          [p](C& o, const py::handle& value) {
-            T v{};
-            value_in(v, value);
-            p.set(o, v);
-          },
-          doc.c_str());
+      std::string doc =
+          type_name<T, Index>() + ". Reading gives a copy; assign the whole value to change it.";
+      const auto set = [p](O& o, const py::handle& value) {
+        T v{};
+        value_in(v, value);
+        p.set(o, v);
+      };
+      if constexpr (kFixed<T>) {
+        doc += " Called with indices, " + name +
+               "(...) gives one value of the object's own; with the indices and a value it "
+               "stores that value in the object.";
+        cls.def_property(
+            name.c_str(),
+            [p](const std::shared_ptr<O>& o) {
+              auto view = FixedView<T, Index>{Ref<T>::own(p.get(*o)), {}};
+              view.member = [p, o](const py::args& args) { return indexed_member(p, *o, args); };
+              return py::cast(std::move(view));
+            },
+            set, doc.c_str());
+      } else {
+        cls.def_property(
+            name.c_str(), [p](const O& o) { return value_copy_out<Index>(p.get(o)); }, set,
+            doc.c_str());
+      }
     }
   });
 }
@@ -78,7 +135,11 @@ ByteArray, read from its lower bound). Raises StreamError, with the
 event-log entries of the read, when the stream is not valid. Bytes after
 the object are not read.)");
   }
-  if constexpr (DescribedObject<C>) add_described_properties<C>(cls);
+  if constexpr (DescribedObject<C>) {
+    if constexpr (std::is_same_v<typename ObjectDescription<C>::Interface, C>) {
+      add_described_properties<C>(cls);
+    }
+  }
   return cls;
 }
 
@@ -149,9 +210,46 @@ entries of the write, when the object cannot be streamed out.)");
            py::arg("idx"), py::arg("tile"), "Puts tile at idx.")
       .def_property_readonly("count", &IKVTileSet::count);
 
-  Interface<IKVTolerance>(m, "IKVTolerance", "One tolerance of a tolerance set.");
-  Interface<IKVCalibration>(m, "IKVCalibration", "A certification of a tile set.");
-  Interface<IKVProfile>(m, "IKVProfile", "An instrument profile.");
+  Interface<IKVTolerance> tolerance(m, "IKVTolerance", "One tolerance of a tolerance set.");
+  add_described_properties<KVTolerance>(tolerance);
+
+  Interface<IKVCalTile>(m, "IKVCalTile", "One tile's certified SCE and SCI spectra.")
+      .def_property("Order", py::overload_cast<>(&IKVCalTile::Order, py::const_),
+                    py::overload_cast<Integer>(&IKVCalTile::Order),
+                    "Position in the calibration; setting it writes the tile back there.")
+      .def("SCWL", py::overload_cast<const eSC&, const Integer&>(&IKVCalTile::SCWL, py::const_),
+           py::arg("sc"), py::arg("WL"),
+           "The value of band WL (1 to 40) of spectrum sc; 0 for any other band (error 9 for "
+           "an sc other than SCE or SCI).")
+      .def("SCWL", py::overload_cast<const eSC&, const Integer&, const Double&>(&IKVCalTile::SCWL),
+           py::arg("sc"), py::arg("WL"), py::arg("value"),
+           "Stores the value of band WL of spectrum sc and writes the tile back into its "
+           "calibration.");
+
+  Interface<IKVCalibration>(m, "IKVCalibration", "A certification of a tile set.")
+      .def_property("TSN", py::overload_cast<>(&IKVCalibration::TSN, py::const_),
+                    py::overload_cast<const String&>(&IKVCalibration::TSN),
+                    "The tile set's serial number, 8 characters (cut or padded with blanks).")
+      .def_property("DateCertified",
+                    py::overload_cast<>(&IKVCalibration::DateCertified, py::const_),
+                    py::overload_cast<Date>(&IKVCalibration::DateCertified))
+      .def_property("TempCalibrated",
+                    py::overload_cast<>(&IKVCalibration::TempCalibrated, py::const_),
+                    py::overload_cast<Single>(&IKVCalibration::TempCalibrated))
+      .def("Tiles", py::overload_cast<Integer>(&IKVCalibration::Tiles), py::arg("idx"),
+           "A new tile holding the spectra of slot idx (1 to 13), attached to this calibration: "
+           "its changes are written back.")
+      .def("Tiles",
+           py::overload_cast<Integer, const std::shared_ptr<IKVCalTile>&>(&IKVCalibration::Tiles),
+           py::arg("idx"), py::arg("tile"),
+           "Copies the tile's spectra into slot idx (1 to 13; other indexes are ignored).");
+
+  Interface<IKVProfile> profile(m, "IKVProfile", R"(
+An instrument profile. Each correction table (WhiteCorrection, ...) reads as
+a copy indexed by SC member and band; called as the interface's member,
+profile.WhiteCorrection(SC.SCI, 40) gives one value and
+profile.WhiteCorrection(SC.SCI, 40, 1.25) stores one.)");
+  add_described_properties<KVProfile>(profile);
 
   Interface<IKVTolSet>(m, "IKVTolSet", "A set of tolerances keyed by text.")
       .def("Add", &IKVTolSet::Add, py::arg("newTol"), py::arg("sKey") = String(),
@@ -175,6 +273,11 @@ entries of the write, when the object cannot be streamed out.)");
         return py::iter(py::cast(std::vector<std::shared_ptr<IKVTolerance>>(s.begin(), s.end())));
       });
   bind_object<KVTile, IKVTile, IKVStream>(m, "KVTile", "A reference tile (v1Tile).");
+  bind_object<KVCalTile, IKVCalTile>(m, "KVCalTile",
+                                     "One tile's certified spectra (no stream of its own).")
+      .def_property("v1Tile", py::overload_cast<>(&KVCalTile::v1Tile, py::const_),
+                    py::overload_cast<const tSCPair&>(&KVCalTile::v1Tile),
+                    "Both spectra (a copy); setting it writes the tile back into its calibration.");
   bind_object<KVTileSet, IKVObj, IKVStream, IKVTileSet>(
       m, "KVTileSet", "A reference tile set of 13 tiles (v1TileSet).");
   bind_object<KVCalibration, IKVObj, IKVCalibration, IKVStream>(

@@ -21,24 +21,45 @@ Long index_of(const py::handle& key) {
   return key.template cast<Long>();
 }
 
+// The place of element i of the array at `array`; error 9 at every use
+// once i is outside the array's bounds.
+template <class A>
+auto element(const Ref<A>& array, Long i) {
+  return array.inner([i](A & a) -> auto& { return a(i); });
+}
+
+// The indices of an array, in order (none for an array without bounds).
+template <class A>
+std::pair<Long, Long> index_range(const A& a) {
+  if constexpr (kFixed<A>) {
+    return {A::kLower, A::kUpper};
+  } else {
+    if (a.rank() == 0) return {1, 0};
+    return {a.lbound(), a.ubound()};
+  }
+}
+
 // The members every array view has: len, indexing by the array's own
 // indices (error 9 outside them), iteration, bounds, == and repr.
 template <class V, class Index>
 void add_array_members(py::class_<V>& cls) {
   cls.def("__getitem__",
           [](const V& v, const py::handle& key) {
-            return value_out((*v.array)(index_of<Index>(key)), v.owner);
+            const Long i = index_of<Index>(key);
+            (void)v.ref.get()(i);  // error 9 now for an index outside the bounds
+            return value_out(element(v.ref, i));
           })
       .def("__setitem__",
            [](const V& v, const py::handle& key, const py::handle& value) {
-             value_in((*v.array)(index_of<Index>(key)), value);
+             value_in(v.ref.get()(index_of<Index>(key)), value);
            })
-      .def("__len__", [](const V& v) { return v.array->size(); })
+      .def("__len__", [](const V& v) { return v.ref.get().size(); })
       .def(
           "tolist",
           [](const V& v) {
             py::list out;
-            for (auto& item : *v.array) out.append(value_out(item, v.owner));
+            const auto [lower, upper] = index_range(v.ref.get());
+            for (Long i = lower; i <= upper; ++i) out.append(value_out(element(v.ref, i)));
             return out;
           },
           "The elements in index order (records and arrays as views).")
@@ -47,7 +68,7 @@ void add_array_members(py::class_<V>& cls) {
           "__eq__",
           [](const V& v, const py::object& other) -> py::object {
             if (py::isinstance<V>(other))
-              return py::bool_(*v.array == *other.template cast<const V&>().array);
+              return py::bool_(v.ref.get() == other.template cast<const V&>().ref.get());
             if (py::isinstance<py::sequence>(other)) {
               return py::cast(v).attr("tolist")().attr("__eq__")(py::list(other));
             }
@@ -59,10 +80,10 @@ void add_array_members(py::class_<V>& cls) {
              return py::repr(py::cast(v).attr("tolist")()).template cast<std::string>();
            })
       .def_property_readonly(
-          "lbound", [](const V& v) { return v.array->lbound(); },
+          "lbound", [](const V& v) { return v.ref.get().lbound(); },
           "The lower bound (error 9 for an array without bounds).")
       .def_property_readonly(
-          "ubound", [](const V& v) { return v.array->ubound(); },
+          "ubound", [](const V& v) { return v.ref.get().ubound(); },
           "The upper bound (error 9 for an array without bounds).");
 }
 
@@ -70,16 +91,19 @@ template <class A, class Index>
 void bind_fixed(py::module_& m) {
   using V = FixedView<A, Index>;
   ensure_class<typename A::value_type>(m);
-  std::string name = type_name<A>();
+  const std::string name = type_name<A, Index>();
   std::string doc = "A fixed array of " + type_name<typename A::value_type>() + ", indices " +
                     std::to_string(A::kLower) + " to " + std::to_string(A::kUpper);
   if constexpr (!std::is_void_v<Index>) {
-    name += "_by_" + type_name<Index>();
     doc += " (" + type_name<Index>() + " members or numbers)";
   }
   doc += ", inside a record: a view, not a copy.";
   py::class_<V> cls(m, name.c_str(), doc.c_str());
   add_array_members<V, Index>(cls);
+  cls.def("__call__", [](const V& v, const py::args& args) {
+    if (!v.member) throw py::type_error("only an object's indexed property can be called");
+    return v.member(args);
+  });
 }
 
 template <class A>
@@ -91,28 +115,30 @@ void bind_dynamic(py::module_& m) {
   py::class_<V> cls(m, type_name<A>().c_str(), doc.c_str());
   add_array_members<V, void>(cls);
   cls.def_property_readonly(
-         "rank", [](const V& v) { return v.array->rank(); },
+         "rank", [](const V& v) { return v.ref.get().rank(); },
          "Number of dimensions, 0 for an array without bounds.")
       .def(
-          "redim", [](const V& v, Long lower, Long upper) { v.array->redim(lower, upper); },
+          "redim", [](const V& v, Long lower, Long upper) { v.ref.get().redim(lower, upper); },
           py::arg("lower"), py::arg("upper"), "New bounds; every element starts fresh.")
       .def(
           "redim_preserve",
-          [](const V& v, Long lower, Long upper) { v.array->redim_preserve(lower, upper); },
+          [](const V& v, Long lower, Long upper) { v.ref.get().redim_preserve(lower, upper); },
           py::arg("lower"), py::arg("upper"), "New bounds; elements inside both bounds stay.")
       .def(
-          "erase", [](const V& v) { v.array->erase(); }, "Removes the bounds and every element.");
+          "erase", [](const V& v) { v.ref.get().erase(); },
+          "Removes the bounds and every element.");
 }
 
 // A field's value as Python sees it; a Variant field is the record it holds
 // (a copy) or None.
 template <class D, class M>
-py::object field_out(M& member, const py::object& owner) {
+py::object field_out(const Ref<M>& member) {
   if constexpr (!std::is_void_v<typename D::holds_type>) {
-    if (const auto* held = member.template get_if<typename D::holds_type>()) return py::cast(*held);
+    if (const auto* held = member.get().template get_if<typename D::holds_type>())
+      return py::cast(*held);
     return py::none();
   } else {
-    return value_out<typename D::index_type>(member, owner);
+    return value_out<typename D::index_type>(member);
   }
 }
 
@@ -155,19 +181,19 @@ void bind_record(py::module_& m) {
     if constexpr (!std::is_void_v<typename D::holds_type>) {
       doc += type_name<typename D::holds_type>() + " or None";
     } else {
-      doc += type_name<typename D::member_type>();
+      doc += type_name<typename D::member_type, typename D::index_type>();
     }
   });
   doc += "\n\n" + name + "(**fields) sets the fields given; the others start empty or zero.";
   if constexpr (cli::kStandsForArray<R>) {
     doc += "\nIt stands for its one array: indexing, len and iteration reach it directly.";
   }
-  py::class_<R> cls(m, name.c_str(), doc.c_str());
+  py::class_<Ref<R>> cls(m, name.c_str(), doc.c_str());
   cls.def(py::init([](const py::kwargs& fields) {
        R r;
        for (const auto& [key, value] : fields)
          set_field(r, key.template cast<std::string>(), value);
-       return r;
+       return Ref<R>::own(std::move(r));
      }))
       .def(
           "__eq__", [](const R& a, const R& b) { return a == b; }, py::is_operator())
@@ -202,13 +228,12 @@ void bind_record(py::module_& m) {
     } else {
       ensure_class<typename D::holds_type>(m);
     }
-    cls.def_property(std::string(d.name).c_str(), py::cpp_function([d](const py::object& self) {
-                       return field_out<D>(d.of(self.template cast<R&>()), self);
-                     }),
-                     py::cpp_function(
-                         [d](const py::object& self, const py::handle& value) {
-                           field_in<D>(d.of(self.template cast<R&>()), value);
-                         },
+    cls.def_property(
+        std::string(d.name).c_str(), py::cpp_function([d](const Ref<R>& self) {
+          return field_out<D>(self.inner([d](R& r) -> M& { return d.of(r); }));
+        }),
+        py::cpp_function([d](const Ref<R>& self,
+                             const py::handle& value) { field_in<D>(d.of(self.get()), value); },
                          py::is_method(cls)));
   });
   if constexpr (cli::kStandsForArray<R>) {
@@ -242,7 +267,7 @@ void bind_enum(py::module_& m, const char* name) {
 template <class T, class Index>
 void ensure_class(py::module_& m) {
   if constexpr (DescribedRecord<T>) {
-    if (!registered<T>()) bind_record<T>(m);
+    if (!registered<Ref<T>>()) bind_record<T>(m);
   } else if constexpr (kFixed<T>) {
     if (!registered<FixedView<T, Index>>()) bind_fixed<T, Index>(m);
   } else if constexpr (kDynamic<T>) {

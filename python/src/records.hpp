@@ -11,8 +11,8 @@
 //
 // A record, or an array element, reached through another record is that
 // record's own, not a copy: changing it changes the record that holds it.
-// It stays valid while the holding record lives and the array that holds it
-// keeps its size.
+// It is found again at every use (see Ref): an element of a dynamic array
+// is the one at its index now, IndexError once the index is gone.
 
 #include <pybind11/pybind11.h>
 
@@ -30,26 +30,27 @@ constexpr bool kFixed = cli::FixedArrayValue<T>;
 template <class T>
 constexpr bool kDynamic = cli::DynamicArrayValue<T>;
 
-// A fixed array inside a record Python holds (`owner`).
+// A fixed array inside a value Python holds. `member`, for an object's
+// property, is the interface's indexed member (see objects.cpp).
 template <class A, class Index>
 struct FixedView {
-  A* array;
-  py::object owner;
+  Ref<A> ref;
+  std::function<py::object(const py::args&)> member;
 };
 
-// A dynamic array inside a record Python holds (`owner`).
+// A dynamic array inside a value Python holds.
 template <class A>
 struct ArrayView {
-  A* array;
-  py::object owner;
+  Ref<A> ref;
 };
 
 // The Python class of a value type, registered on first use.
 template <class T, class Index = void>
 void ensure_class(py::module_& m);
 
-// The name a value type goes by in class names and documentation.
-template <class T>
+// The name a value type goes by in class names and documentation; a fixed
+// array indexed by an enumeration (Index) names it too.
+template <class T, class Index = void>
 std::string type_name() {
   if constexpr (std::is_same_v<T, Single>) {
     return "Single";
@@ -70,8 +71,10 @@ std::string type_name() {
   } else if constexpr (std::is_enum_v<T>) {
     return py::type::of<T>().attr("__name__").template cast<std::string>();
   } else if constexpr (kFixed<T>) {
-    return "FixedArray_" + type_name<typename T::value_type>() + "_" + std::to_string(T::kLower) +
-           "_" + std::to_string(T::kUpper);
+    std::string name = "FixedArray_" + type_name<typename T::value_type>() + "_" +
+                       std::to_string(T::kLower) + "_" + std::to_string(T::kUpper);
+    if constexpr (!std::is_void_v<Index>) name += "_by_" + type_name<Index>();
+    return name;
   } else if constexpr (kDynamic<T>) {
     return "Array_" + type_name<typename T::value_type>();
   } else {
@@ -79,18 +82,18 @@ std::string type_name() {
   }
 }
 
-// A value inside a record (or array) as Python sees it: a record or array by
-// reference into `owner`, anything else by value.
+// The value at `place` as Python sees it: a record or array as a view of
+// the place, anything else by value.
 template <class Index = void, class T>
-py::object value_out(T& v, const py::object& owner) {
+py::object value_out(const Ref<T>& place) {
   if constexpr (DescribedRecord<T>) {
-    return py::cast(&v, py::return_value_policy::reference_internal, owner);
+    return py::cast(place);
   } else if constexpr (kFixed<T>) {
-    return py::cast(FixedView<T, Index>{&v, owner});
+    return py::cast(FixedView<T, Index>{place, {}});
   } else if constexpr (kDynamic<T>) {
-    return py::cast(ArrayView<T>{&v, owner});
+    return py::cast(ArrayView<T>{place});
   } else {
-    return py::cast(v);
+    return py::cast(place.get());
   }
 }
 
@@ -131,13 +134,13 @@ void value_in(T& target, const py::handle& src) {
     if (py::isinstance<py::dict>(src)) {
       target = record_from_dict<T>(src);
     } else if constexpr (cli::kStandsForArray<T>) {
-      if (!py::isinstance<T>(src)) {
+      if (!py::isinstance<Ref<T>>(src)) {
         for_each_field(target, [&](const auto&, auto& member) { value_in(member, src); });
         return;
       }
-      target = src.template cast<const T&>();
+      target = src.template cast<const Ref<T>&>().get();
     } else {
-      target = src.template cast<const T&>();
+      target = src.template cast<const Ref<T>&>().get();
     }
   } else if constexpr (kFixed<T>) {
     const py::list items(py::reinterpret_borrow<py::object>(src));
@@ -151,7 +154,7 @@ void value_in(T& target, const py::handle& src) {
     target = std::move(fresh);
   } else if constexpr (kDynamic<T>) {
     if (py::isinstance<ArrayView<T>>(src)) {
-      target = T(*src.template cast<const ArrayView<T>&>().array);
+      target = T(src.template cast<const ArrayView<T>&>().ref.get());
       return;
     }
     const py::list items(py::reinterpret_borrow<py::object>(src));
@@ -168,13 +171,11 @@ void value_in(T& target, const py::handle& src) {
 }
 
 // A value Python receives as its own (an object's property): a record or
-// scalar by value, an array as a view on a copy that the view owns.
+// scalar by value, an array as a view of a copy that the view owns.
 template <class Index = void, class T>
 py::object value_copy_out(T value) {
   if constexpr (kFixed<T> || kDynamic<T>) {
-    auto* held = new T(std::move(value));
-    const py::capsule owner(held, [](void* p) { delete static_cast<T*>(p); });
-    return value_out<Index>(*held, owner);
+    return value_out<Index>(Ref<T>::own(std::move(value)));
   } else {
     return py::cast(std::move(value));
   }

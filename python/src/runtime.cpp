@@ -200,7 +200,8 @@ Variant to_variant(const py::handle& value) {
   if (py::isinstance<py::float_>(value)) return Variant(value.cast<Double>());
   if (py::isinstance<py::str>(value)) return Variant(value.cast<String>());
   if (py::isinstance<Date>(value)) return Variant(value.cast<Date>());
-  if (py::isinstance<tOVProfileDataV1>(value)) return Variant(value.cast<tOVProfileDataV1>());
+  if (py::isinstance<Ref<tOVProfileDataV1>>(value))
+    return Variant(value.cast<const Ref<tOVProfileDataV1>&>().get());
   if (py::isinstance<PyByteArray>(value)) return Variant(value.cast<PyByteArray&>().array);
   if (py::isinstance<py::sequence>(value) || py::hasattr(value, "__array__")) {
     const py::list items = py::module_::import("builtins").attr("list")(value);

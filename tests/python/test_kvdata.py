@@ -97,6 +97,51 @@ def test_records_views_and_construction():
         kvdata.tTileSet.from_dict({"TSN": "x", "Tiles": [{"Name": "a", "ColorRGB": 1}]})
 
 
+# Ways an element taken from a dynamic array can lose its place, and whether
+# index 3 still holds an element afterwards.
+@pytest.mark.parametrize("change, index_stays", [
+    (lambda ts: ts.Tiles.redim_preserve(1, 2), False),
+    (lambda ts: ts.Tiles.erase(), False),
+    (lambda ts: setattr(ts, "Tiles", []), False),
+    (lambda ts: ts.Tiles.redim(1, 500), True),      # new storage; index 3 is a fresh tile
+    (lambda ts: None, True),
+])
+def test_elements_follow_their_index_after_the_array_changes(change, index_stays):
+    outer = kvdata.tTileSet(Tiles=[kvdata.tTileDef(Name=f"T{i}") for i in range(1, 4)])
+    ts = kvdata.tTileSet()
+    ts.Tiles = outer.Tiles                           # a copy of the array, not a view of outer
+    tile, temp = ts.Tiles[3], ts.Tiles[3].TempComp
+    orphan = kvdata.tTileSet(Tiles=[kvdata.tTileDef(Name="kept")]).Tiles[1]
+    change(ts)
+    assert orphan.Name == "kept" and outer.Tiles[3].Name == "T3"
+    if index_stays:
+        temp[40] = 0.25
+        assert tile.TempComp[40] == ts.Tiles[3].TempComp[40] == 0.25
+        assert tile.Name == ts.Tiles[3].Name
+    else:
+        for use in (lambda: tile.Name, lambda: temp[1], lambda: setattr(tile, "Name", "x")):
+            with pytest.raises(IndexError):
+                use()
+
+
+def test_interface_members_reach_the_object():
+    data = (EXAMPLES / "streams" / "calibration.kvs").read_bytes()
+    cal = kvdata.KVCalibration.from_bytes(data)
+    tile = kvdata.query(cal, kvdata.IKVCalibration).Tiles(13)
+    tile.SCWL(kvdata.SC.SCI, 40, 87.5)               # written back into the calibration
+    assert cal.v1Calibration.Tiles[13][kvdata.SC.SCI][40] == 87.5 == cal.Tiles(13).SCWL(kvdata.SC.SCI, 40)
+    cal.TSN = "CT-9"
+    assert cal.v1Calibration.TSN.rstrip() == "CT-9" and cal.to_bytes() != data
+    profile = kvdata.query(kvdata.KVProfile.from_bytes((EXAMPLES / "streams" / "profile.kvs").read_bytes()),
+                           kvdata.IKVProfile)
+    table = profile.WhiteCorrection                  # a copy: the call below changes the object
+    profile.WhiteCorrection(kvdata.SC.SCI, 40, 1.25)
+    assert profile.WhiteCorrection(kvdata.SC.SCI, 40) == profile.WhiteCorrection[kvdata.SC.SCI][40] == 1.25
+    assert table[kvdata.SC.SCI][40] != 1.25
+    again = kvdata.KVProfile.from_bytes(kvdata.query(profile, kvdata.IKVStream).to_bytes())
+    assert again.WhiteCorrection(kvdata.SC.SCI, 40) == 1.25 and again.ISN == profile.ISN
+
+
 def test_batch_matches_ilu_d6510_bit_for_bit():
     rng = np.random.default_rng(19)
     spectra = (rng.random((2000, 40), dtype=np.float32) * 120).astype(np.float32)
@@ -123,6 +168,7 @@ def test_errors_map_to_exception_types():
         (lambda: kvdata.tTileSet().Tiles.lbound, 9, IndexError),
         (lambda: kvdata.ILU_D6510.create().calcXYZ([3.4e38] * 40), 6, OverflowError),
         (lambda: kvdata.KVTolSet.create().Add(None), 91, ValueError),
+        (lambda: kvdata.KVProfile.create().WhiteCorrection(kvdata.SC.SCI, 41, 1.0), 9, IndexError),
     ]
     twice = kvdata.KVTolSet.create()
     twice.Add(kvdata.KVTolerance.create(), "a")
