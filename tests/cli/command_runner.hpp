@@ -13,6 +13,7 @@
 #include <filesystem>
 #include <fstream>
 #include <iterator>
+#include <sstream>
 #include <string>
 #include <vector>
 
@@ -37,6 +38,48 @@ inline void spill(const std::filesystem::path& p, const std::string& bytes) {
 
 inline std::string example(const std::string& relative) {
   return std::string(KVDATA_SOURCE_DIR) + "/examples/" + relative;
+}
+
+// The rows of a table in tests/cli/data/: lines of cells split at '|' and
+// trimmed; blank lines and lines starting with '#' are left out.
+inline std::vector<std::vector<std::string>> read_table(const std::string& name) {
+  std::ifstream in(std::string(KVDATA_SOURCE_DIR) + "/tests/cli/data/" + name);
+  std::vector<std::vector<std::string>> rows;
+  for (std::string line; std::getline(in, line);) {
+    if (line.empty() || line[0] == '#') continue;
+    std::vector<std::string> cells;
+    std::stringstream parts(line);
+    for (std::string cell; std::getline(parts, cell, '|');) {
+      const auto first = cell.find_first_not_of(' ');
+      cells.push_back(first == std::string::npos
+                          ? ""
+                          : cell.substr(first, cell.find_last_not_of(' ') - first + 1));
+    }
+    if (line.back() == '|') cells.emplace_back();
+    rows.push_back(std::move(cells));
+  }
+  return rows;
+}
+
+// `bytes` after the damages, separated by ';': "cut N" keeps the first N
+// bytes, "put AT XX XX .." overwrites bytes from offset AT, "add N" appends
+// N zero bytes.
+inline std::string damaged(std::string bytes, const std::string& damages) {
+  std::stringstream all(damages);
+  for (std::string damage; std::getline(all, damage, ';');) {
+    std::stringstream words(damage);
+    std::string how;
+    std::size_t n = 0;
+    words >> how >> n;
+    if (how == "cut") {
+      bytes.resize(n);
+    } else if (how == "add") {
+      bytes.append(n, '\0');
+    } else if (how == "put") {
+      for (unsigned byte = 0; words >> std::hex >> byte; ++n) bytes.at(n) = static_cast<char>(byte);
+    }
+  }
+  return bytes;
 }
 
 // A scratch folder of its own for each test, removed afterwards.

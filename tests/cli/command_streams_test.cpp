@@ -1,8 +1,6 @@
 // kvdata decode, encode and explain on the shipped examples.
 #include <gtest/gtest.h>
 
-#include <fstream>
-#include <sstream>
 #include <string>
 #include <vector>
 
@@ -70,49 +68,22 @@ TEST(CommandStreams, EveryExampleDecodesToItsJsonAndEncodesBackToTheSameBytes) {
 // One line of tests/cli/data/damaged-streams.txt.
 struct DamageCase {
   std::string kind;
-  std::string damage;  // "cut N", "put AT XX ..", "add N"
+  std::string damage;  // as test::damaged takes it
   std::size_t stop = 0;
   std::string field;
   std::string expected;
 };
 
-std::string trimmed(const std::string& s) {
-  const auto first = s.find_first_not_of(' ');
-  if (first == std::string::npos) return "";
-  return s.substr(first, s.find_last_not_of(' ') - first + 1);
-}
-
 std::vector<DamageCase> damage_cases() {
-  std::ifstream in(std::string(KVDATA_SOURCE_DIR) + "/tests/cli/data/damaged-streams.txt");
   std::vector<DamageCase> cases;
-  std::string line;
-  while (std::getline(in, line)) {
-    if (line.empty() || line[0] == '#') continue;
-    std::vector<std::string> cells;
-    std::stringstream parts(line);
-    for (std::string cell; std::getline(parts, cell, '|');) cells.push_back(trimmed(cell));
+  for (const auto& cells : test::read_table("damaged-streams.txt")) {
     if (cells.size() != 5) {
-      ADD_FAILURE() << "not five cells: " << line;
+      ADD_FAILURE() << "not five cells: " << cells.front();
       continue;
     }
     cases.push_back({cells[0], cells[1], std::stoul(cells[2]), cells[3], cells[4]});
   }
   return cases;
-}
-
-std::string damaged(std::string bytes, const std::string& damage) {
-  std::stringstream words(damage);
-  std::string how;
-  std::size_t n = 0;
-  words >> how >> n;
-  if (how == "cut") {
-    bytes.resize(n);
-  } else if (how == "add") {
-    bytes.append(n, '\0');
-  } else {
-    for (unsigned byte = 0; words >> std::hex >> byte; ++n) bytes.at(n) = static_cast<char>(byte);
-  }
-  return bytes;
 }
 
 TEST(CommandStreams, DamagedStreamsStopWhereTheLibraryReaderStops) {
@@ -122,7 +93,7 @@ TEST(CommandStreams, DamagedStreamsStopWhereTheLibraryReaderStops) {
     SCOPED_TRACE(d.kind + " | " + d.damage);
     Scratch s;
     const std::string path = s.path("damaged.kvs");
-    spill(path, damaged(slurp(stream_of(d.kind)), d.damage));
+    spill(path, test::damaged(slurp(stream_of(d.kind)), d.damage));
 
     const auto explained = kvdata({"explain", d.kind, path, "--json"});
     EXPECT_EQ(explained.code, 1);

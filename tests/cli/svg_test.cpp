@@ -29,13 +29,14 @@ std::vector<std::string> series_names(xmlNode* node) {
 }
 
 TEST(Svg, ChartIsWellFormedWithOneGroupPerSeriesAndEscapedNames) {
-  SvgChart chart("Tiles <of> \"CT-4471\" & co", "wavelength (nm)", "reflectance (%)");
+  SvgChart chart("Tiles <of> \"CT-4471\" & co", "wavelength (nm)");
+  const std::size_t p = chart.add_panel("Reflectance", "reflectance (%)");
   std::vector<Point> a = {{360, 10}, {370, 12}}, b = {{360, 11}, {370, 13}};
-  chart.add_line("White & <bright>", "#FFFFFF", a);
-  chart.add_line("White & <bright>", "#FFFFFF", b, true);
-  chart.add_band("Blue", "#1F3C99", a, b);
-  chart.add_line("Blue", "#1F3C99", b);
-  chart.add_line(std::string("Bad\x01name"), "#000000", a);
+  chart.add_line(p, "White & <bright>", {"#FFFFFF", ""}, a);
+  chart.add_line(p, "White & <bright>", {"#FFFFFF", "7 4"}, b, 1);
+  chart.add_band(p, "Blue", "#1F3C99", a, b);
+  chart.add_line(p, "Blue", {"#1F3C99", ""}, b);
+  chart.add_line(p, std::string("Bad\x01name"), {"#000000", ""}, a);
   const std::string svg = chart.render();
 
   xmlDoc* doc = xmlReadMemory(svg.data(), static_cast<int>(svg.size()), "chart.svg", nullptr,
@@ -45,7 +46,7 @@ TEST(Svg, ChartIsWellFormedWithOneGroupPerSeriesAndEscapedNames) {
             (std::vector<std::string>{"White & <bright>", "Blue", "Bad?name"}));
   xmlFreeDoc(doc);
   // The white line has a dark outline; the dashed line keeps its dashes.
-  EXPECT_NE(svg.find("stroke=\"#555555\" stroke-width=\"3.5\""), std::string::npos);
+  EXPECT_NE(svg.find("<path class=\"outline\""), std::string::npos);
   EXPECT_NE(svg.find("stroke-dasharray"), std::string::npos);
   EXPECT_NE(svg.find("<polygon"), std::string::npos);
 }

@@ -200,15 +200,20 @@ void run_spread(const SpreadOptions& o) {
   }
 
   if (!o.svg.empty()) {
-    SvgChart chart("Repeatability: average with the lowest-to-highest band", "wavelength (nm)",
-                   "reflectance (%)");
+    // The spread is a small fraction of the reflectance, so it gets a scale
+    // of its own: the standard deviation per band in a second panel.
+    SvgChart chart("Repeatability of the white and the blue tile", "wavelength (nm)");
+    const std::size_t levels = chart.add_panel(
+        "Average, with the band from the lowest to the highest reading", "reflectance (%)");
+    const std::size_t spread = chart.add_panel("Standard deviation per band", "reflectance (%)");
     const char* colours[2] = {"#8C8C8C", "#1F3C99"};
     const char* names[2] = {"White tile", "Blue tile"};
     for (int t = 0; t < 2; ++t) {
       const std::string name =
           std::string(names[t]) + " (" + std::to_string(rows[t].samples) + " samples)";
-      chart.add_band(name, colours[t], points(rows[t].lowest), points(rows[t].highest));
-      chart.add_line(name, colours[t], points(rows[t].average));
+      chart.add_band(levels, name, colours[t], points(rows[t].lowest), points(rows[t].highest));
+      chart.add_line(levels, name, {colours[t], ""}, points(rows[t].average));
+      chart.add_line(spread, name, {colours[t], ""}, points(rows[t].std_dev));
     }
     write_atomically(o.svg, chart.render());
   }
@@ -232,7 +237,8 @@ void add_spread(CLI::App& app) {
       ->check(format_check(false));
   cmd->add_option("-o,--output", o->output, "Write to this file instead of standard output");
   cmd->add_option("--svg", o->svg,
-                  "Also draw both tiles' average with the lowest-to-highest band to this SVG file");
+                  "Also draw both tiles' average with the lowest-to-highest band, and the standard "
+                  "deviation per band on a scale of its own, to this SVG file");
   cmd->footer(
       "One reading per row, 40 bands from 360 to 750 nm. The standard deviation is the\n"
       "sample standard deviation (n - 1) of each band, handed to the spread test.\n\n"

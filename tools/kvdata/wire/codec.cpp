@@ -66,6 +66,8 @@ void visit_spectra(const T& v, const std::string& path, const String* name, cons
       }
     });
     for_each_field(v, [&](const auto& d, const auto& member) {
+      // A field no stream carries holds nothing a stream could show.
+      if (!d.streamed) return;
       using D = DescriptionOf<decltype(d)>;
       const std::string at = member_path(path, d.name);
       if constexpr (!std::is_void_v<typename D::holds_type>) {
