@@ -422,8 +422,9 @@ class CgatsWriter : public ResultWriter {
   }
   void write(const BlockResults& r) override {
     for (std::size_t i = 0; i < r.count(); ++i) {
+      check_cgats_sets(++sets_);
       cells_.clear();
-      cells_.push_back(std::to_string(++sets_));
+      cells_.push_back(std::to_string(sets_));
       cells_.push_back(r.samples->labels[i]);
       // The reference's name has no CGATS field.
       for_each_cell(
