@@ -134,8 +134,8 @@ TEST(CommandCompute, ColourAgainstAReferenceGivesTheDifferencesOfEachSample) {
   const auto one =
       kvdata({"colour", example("spectra/tiles.csv"), "--against", s.path("white-only.csv")});
   EXPECT_EQ(one.code, 0) << one.err;
-  const auto two =
-      kvdata({"colour", example("spectra/tiles.csv"), "--against", example("spectra/white.csv")});
+  const auto two = kvdata({"colour", example("spectra/tiles.csv"), "--against",
+                           example("spectra/white.csv"), "--pair", "position"});
   EXPECT_EQ(two.code, 1);
   EXPECT_NE(two.err.find("holds 20 spectra"), std::string::npos) << two.err;
 

@@ -170,6 +170,7 @@ SpectraTable read_cgats(const std::string& path) {
               "SPECTRAL_NM360)");
   }
   if (name_field < 0) name_field = id_field;
+  table.named = name_field >= 0;
 
   const char* sets_text = cmsIT8GetProperty(it8.get(), "NUMBER_OF_SETS");
   const auto sets = number(sets_text);
