@@ -804,7 +804,8 @@ void add_colour(CLI::App& app) {
   cmd->footer(
       "Spectra need the 40 bands from 360 to 750 nm at 10 nm; columns or fields are named\n"
       "by wavelength (360, nm360, SPECTRAL_NM360, ...). A file that does not cover them is\n"
-      "refused unless --extend may fill the missing end bands.\n\n"
+      "refused unless --extend may fill the missing end bands. Other wavelengths are not\n"
+      "used, which a warning says.\n\n"
       "A single reference spectrum serves every sample. Otherwise, when both files name their\n"
       "samples (SAMPLE_NAME, SAMPLE_ID or a name column), each sample is compared with the\n"
       "reference of its name, and a sample without one is refused; when either file does not,\n"
