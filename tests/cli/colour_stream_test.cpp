@@ -169,8 +169,8 @@ TEST(ColourStream, ReferencesPairedAcrossBlocks) {
   std::vector<Sample> samples, references;
   spill(s.path("samples.csv"), make_file(kRows, "S", samples));
   spill(s.path("refs.csv"), make_file(kRows, "R", references, 5));
-  const auto r =
-      kvdata({"colour", s.path("samples.csv"), "--against", s.path("refs.csv"), "--format", "csv"});
+  const auto r = kvdata({"colour", s.path("samples.csv"), "--against", s.path("refs.csv"), "--pair",
+                         "position", "--format", "csv"});
   ASSERT_EQ(r.code, 0) << r.err;
   const auto rows = csv_rows(r.out);
   ASSERT_EQ(rows.size(), kRows + 1);
@@ -194,8 +194,8 @@ TEST(ColourStream, ReferencesPairedAcrossBlocks) {
   std::vector<Sample> unused;
   for (std::size_t count : {kRows - 1, kRows + 1}) {
     spill(s.path("refs.csv"), make_file(count, "R", unused));
-    const auto bad = kvdata({"colour", s.path("samples.csv"), "--against", s.path("refs.csv"), "-o",
-                             s.path("out.csv")});
+    const auto bad = kvdata({"colour", s.path("samples.csv"), "--against", s.path("refs.csv"),
+                             "--pair", "position", "-o", s.path("out.csv")});
     EXPECT_EQ(bad.code, 1);
     EXPECT_NE(bad.err.find("refs.csv: holds " + std::to_string(count) + " spectra"),
               std::string::npos)

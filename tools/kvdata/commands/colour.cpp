@@ -9,6 +9,7 @@
 // start with figures known only at the end (the count, the column widths),
 // so their rows are set aside in a spool and written behind the head.
 #include <algorithm>
+#include <array>
 #include <charconv>
 #include <cmath>
 #include <cstring>
@@ -18,6 +19,7 @@
 #include <memory>
 #include <optional>
 #include <string_view>
+#include <unordered_map>
 #include <utility>
 
 #include "commands/commands.hpp"
@@ -49,6 +51,7 @@ struct ColourOptions {
   std::string output;
   std::string de = "ab";
   std::string cmc_lc = "2:1";
+  std::string pair;  // "name", "position" or empty: by name when both files name their samples
   bool lch = false;
   bool summary_only = false;
   // From de and cmc_lc.
@@ -422,8 +425,9 @@ class CgatsWriter : public ResultWriter {
   }
   void write(const BlockResults& r) override {
     for (std::size_t i = 0; i < r.count(); ++i) {
+      check_cgats_sets(++sets_);
       cells_.clear();
-      cells_.push_back(std::to_string(++sets_));
+      cells_.push_back(std::to_string(sets_));
       cells_.push_back(r.samples->labels[i]);
       // The reference's name has no CGATS field.
       for_each_cell(
@@ -458,8 +462,6 @@ class CgatsWriter : public ResultWriter {
   Spool spool_;
 };
 
-// The reference spectra of --against: one for every sample, or one per
-// sample paired row by row, read block by block beside the samples.
 // The references of one block of samples.
 struct PairedReferences {
   std::vector<const std::string*> label;  // per sample
@@ -467,24 +469,46 @@ struct PairedReferences {
   std::vector<Single> lab;                // 3 per sample
 };
 
+// The reference spectra of --against: one for every sample; or, when both
+// files name their samples, the one of the sample's name; or one per sample
+// paired row by row, read block by block beside the samples. --pair name
+// or position chooses.
 class Reference {
  public:
-  Reference(const std::string& path, bool extend) : stream_(path, extend) {
+  Reference(const ColourOptions& o, const SpectraStream& samples)
+      : o_(o), stream_(o.against, o.extend) {
     // Two spectra tell "one for all" from "one per sample".
     stream_.next(ahead_, 2);
-    single_ = ahead_.count == 1;
-    if (single_) convert(ahead_, lab_);
+    single_ = ahead_.count == 1 && o.pair != "name";
+    if (single_) {
+      std::vector<Single> lab;
+      convert(ahead_, lab);
+      one_ = Named{ahead_.labels[0], {lab[0], lab[1], lab[2]}};
+      return;
+    }
+    by_name_ = o.pair == "name" || (o.pair.empty() && samples.named() && stream_.named());
+    for (const SpectraStream* file : std::array<const SpectraStream*, 2>{&samples, &stream_}) {
+      if (by_name_ && !file->named()) {
+        bad_input(file->file() +
+                  ": names no samples (no SAMPLE_NAME, SAMPLE_ID or name column), so its samples "
+                  "cannot be paired by name; --pair position pairs them row by row");
+      }
+    }
+    if (by_name_) read_names();
   }
 
-  // The references of the next `n` samples into `out`: false when the
-  // reference has fewer spectra left than that.
-  bool pair(PairedReferences& out, std::size_t n) {
+  // The references of the block's samples into `out`: false when the
+  // reference, paired row by row, has fewer spectra left than that.
+  // InputError for a sample without a reference of its name.
+  bool pair(PairedReferences& out, const SpectraBlock& samples) {
+    const std::size_t n = samples.count;
     out.label.resize(n);
-    if (single_) {
+    if (single_ || by_name_) {
       out.lab.resize(3 * n);
       for (std::size_t i = 0; i < n; ++i) {
-        out.label[i] = &ahead_.labels[0];
-        std::copy_n(lab_.begin(), 3, out.lab.begin() + 3 * static_cast<std::ptrdiff_t>(i));
+        const Named& r = single_ ? one_ : find(samples, i);
+        out.label[i] = &r.label;
+        std::copy_n(r.lab.begin(), 3, out.lab.begin() + 3 * static_cast<std::ptrdiff_t>(i));
       }
       return true;
     }
@@ -508,9 +532,9 @@ class Reference {
     return true;
   }
 
-  // True when spectra are left after the last pair() call.
+  // True when spectra paired row by row are left after the last pair() call.
   bool more() {
-    if (single_) return false;
+    if (single_ || by_name_) return false;
     if (used_ < ahead_.count) return true;
     used_ = 0;
     return stream_.next(ahead_, kBlock);
@@ -525,17 +549,58 @@ class Reference {
   }
 
  private:
+  struct Named {
+    std::string label;
+    std::array<Single, 3> lab{};
+  };
+
   static void convert(const SpectraBlock& b, std::vector<Single>& lab) {
     std::vector<Single> xyz(3 * b.count);
     lab.assign(3 * b.count, 0);
     (void)calc_xyz_lab_d6510(std::span<const Single>(b.bands.data(), 40 * b.count), xyz, lab);
   }
 
+  // Every reference by its name; rows without a name are left out.
+  void read_names() {
+    std::vector<Single> lab;
+    for (bool more = ahead_.count > 0; more; more = stream_.next(ahead_, kBlock)) {
+      convert(ahead_, lab);
+      for (std::size_t i = 0; i < ahead_.count; ++i) {
+        if (!ahead_.named[i]) continue;
+        const std::string& name = ahead_.labels[i];
+        const auto [at, added] =
+            names_.try_emplace(name, Named{name, {lab[3 * i], lab[3 * i + 1], lab[3 * i + 2]}});
+        if (!added) {
+          bad_input(o_.against + ": two references are named \"" + name +
+                    "\"; pairing by name needs each name once (--pair position pairs samples "
+                    "and references row by row)");
+        }
+      }
+    }
+  }
+
+  const Named& find(const SpectraBlock& samples, std::size_t i) const {
+    const std::string& label = samples.labels[i];
+    if (!samples.named[i]) {
+      bad_input(o_.file + " " + label + ": the sample has no name to find its reference by in " +
+                o_.against + " (--pair position pairs samples and references row by row)");
+    }
+    const auto at = names_.find(label);
+    if (at == names_.end()) {
+      bad_input(o_.file + ": the sample \"" + label + "\" has no reference of its name in " +
+                o_.against + " (--pair position pairs samples and references row by row)");
+    }
+    return at->second;
+  }
+
+  const ColourOptions& o_;
   SpectraStream stream_;
   SpectraBlock ahead_;
   std::size_t used_ = 0;
   bool single_ = false;
-  std::vector<Single> lab_;  // the single reference's LAB
+  bool by_name_ = false;
+  Named one_;  // the single reference
+  std::unordered_map<std::string, Named> names_;
   SpectraBlock block_;
 };
 
@@ -547,10 +612,15 @@ class Reference {
 }
 
 // The chosen differences and the CMC weights from the command line.
-void read_difference_options(ColourOptions& o) {
+// `against_only` are the options given that mean something only with a
+// reference.
+void read_difference_options(ColourOptions& o, const std::vector<std::string>& against_only) {
   o.differences = parse_differences(o.de);
   o.cmc = parse_cmc_weights(o.cmc_lc);
-  if (o.summary_only && o.against.empty()) bad_usage("--summary-only needs --against");
+  if (!against_only.empty() && o.against.empty()) {
+    bad_usage(against_only.front() +
+              " needs --against, which gives the reference spectra to take differences to");
+  }
   if (o.summary_only && o.format == "cgats") {
     bad_usage("--summary-only: the summary is written as a table, CSV or JSON, not CGATS");
   }
@@ -596,7 +666,7 @@ void run_colour(const ColourOptions& o) {
   Job jobs[2];
   bool more = in.next(jobs[0].samples, kBlock);  // the file's own checks come first
   std::optional<Reference> reference;
-  if (!o.against.empty()) reference.emplace(o.against, o.extend);
+  if (!o.against.empty()) reference.emplace(o, in);
 
   const std::string illuminant = to_utf8(ILU_D6510::create()->Illuminant());
   OutputFile out(o.output);
@@ -620,8 +690,7 @@ void run_colour(const ColourOptions& o) {
   // short, the samples are only counted.
   bool references_short = false;
   auto pair = [&](Job& job) {
-    job.paired =
-        !reference || (!references_short && reference->pair(job.references, job.samples.count));
+    job.paired = !reference || (!references_short && reference->pair(job.references, job.samples));
     references_short = !job.paired;
   };
   auto read = [&](Job& job) {
@@ -710,18 +779,23 @@ void add_colour(CLI::App& app) {
       "CIE XYZ and CIELAB (D65, 10-degree observer) of the spectra in a CSV or CGATS file");
   cmd->add_option("FILE", o->file, "Spectra, one sample per row, percent reflectance")->required();
   cmd->add_option("--against", o->against,
-                  "Reference spectra: one for all samples, or one per sample (row by row); adds "
-                  "dL*, da*, db* (sample minus reference) and the differences of --de");
-  cmd->add_option("--de", o->de,
-                  "Colour differences to the reference, comma-separated: ab (dE*ab, the default), "
-                  "94 (dE94), cmc (dECMC) and 2000 (dE00), computed by Little CMS")
-      ->default_str("ab");
-  cmd->add_option("--cmc-lc", o->cmc_lc, "The l:c weights of dECMC (default 2:1)")
-      ->default_str("2:1");
+                  "Reference spectra: one for all samples, or one per sample (by name, or row by "
+                  "row); adds dL*, da*, db* (sample minus reference) and the differences of --de");
+  std::vector<CLI::Option*> against_only = {
+      cmd->add_option("--de", o->de,
+                      "Colour differences to the reference, comma-separated: ab (dE*ab, the "
+                      "default), 94 (dE94), cmc (dECMC) and 2000 (dE00), computed by Little CMS")
+          ->default_str("ab"),
+      cmd->add_option("--cmc-lc", o->cmc_lc, "The l:c weights of dECMC (default 2:1)")
+          ->default_str("2:1"),
+      cmd->add_option("--pair", o->pair,
+                      "How samples find their references: name (the default when both files name "
+                      "their samples) or position (row by row, the default otherwise)")
+          ->check(CLI::IsMember({"name", "position"})),
+      cmd->add_flag("--summary-only", o->summary_only,
+                    "With --against: write only the summary of each difference (count, mean, "
+                    "median, 95th percentile, maximum and its sample)")};
   cmd->add_flag("--lch", o->lch, "Add the chroma C*ab and the hue angle h_ab (degrees, 0 to 360)");
-  cmd->add_flag("--summary-only", o->summary_only,
-                "With --against: write only the summary of each difference (count, mean, median, "
-                "95th percentile, maximum and its sample)");
   cmd->add_flag("--extend", o->extend,
                 "Fill bands missing at either end of 360-750 nm with the nearest measured value");
   cmd->add_option("--format", o->format, "table (default), csv, json or cgats")
@@ -730,15 +804,24 @@ void add_colour(CLI::App& app) {
   cmd->footer(
       "Spectra need the 40 bands from 360 to 750 nm at 10 nm; columns or fields are named\n"
       "by wavelength (360, nm360, SPECTRAL_NM360, ...). A file that does not cover them is\n"
-      "refused unless --extend may fill the missing end bands.\n\n"
+      "refused unless --extend may fill the missing end bands. Other wavelengths are not\n"
+      "used, which a warning says.\n\n"
+      "A single reference spectrum serves every sample. Otherwise, when both files name their\n"
+      "samples (SAMPLE_NAME, SAMPLE_ID or a name column), each sample is compared with the\n"
+      "reference of its name, and a sample without one is refused; when either file does not,\n"
+      "or with --pair position, they are paired row by row.\n\n"
       "The reference is the standard of each difference: dECMC weighs it by the reference's\n"
       "lightness, chroma and hue, so swapping sample and reference changes it (dE*ab, dE00\n"
       "and Little CMS's dE94, with the graphic-arts weights, do not change). With --against\n"
       "the table and JSON end with a summary of each difference over all samples.\n\n"
       "Example:\n  kvdata colour examples/spectra/tiles.csv --against "
       "examples/spectra/tiles-certified.cgats --de ab,2000");
-  cmd->callback([o] {
-    read_difference_options(*o);
+  cmd->callback([o, against_only] {
+    std::vector<std::string> given;
+    for (const CLI::Option* option : against_only) {
+      if (option->count() > 0) given.push_back(option->get_name());
+    }
+    read_difference_options(*o, given);
     run_colour(*o);
   });
 }

@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <cmath>
 #include <cstdio>
+#include <iostream>
 #include <optional>
 
 #include "support/errors.hpp"
@@ -12,6 +13,8 @@ namespace {
 
 constexpr double kFirstNm = 360.0;
 constexpr double kStepNm = 10.0;
+constexpr double kLastNm = kFirstNm + 39 * kStepNm;
+constexpr const char* kBands = "the 40 bands from 360 to 750 nm at 10 nm";
 
 std::string nm_text(double nm) {
   if (nm == std::floor(nm)) return std::to_string(static_cast<long long>(nm));
@@ -25,6 +28,45 @@ std::optional<std::size_t> column_at(const std::vector<double>& wavelengths, dou
     if (std::fabs(wavelengths[i] - nm) < 1e-6) return i;
   }
   return std::nullopt;
+}
+
+// "760 nm", "355, 365 and 760 nm", or coverage() of more.
+std::string listed(const std::vector<double>& wl) {
+  if (wl.size() > 4) return coverage(wl);
+  std::string text;
+  for (std::size_t i = 0; i < wl.size(); ++i) {
+    if (i > 0) text += i + 1 == wl.size() ? " and " : ", ";
+    text += nm_text(wl[i]);
+  }
+  return text + " nm";
+}
+
+// Says once, on standard error, which of the file's wavelengths are none of
+// the bands: below or above them, or between them.
+void warn_unused(const std::string& file, std::vector<double> wavelengths) {
+  std::sort(wavelengths.begin(), wavelengths.end());
+  std::vector<double> below, between, above;
+  for (const double nm : wavelengths) {
+    const double band = (nm - kFirstNm) / kStepNm;
+    if (nm < kFirstNm - 1e-6) {
+      below.push_back(nm);
+    } else if (nm > kLastNm + 1e-6) {
+      above.push_back(nm);
+    } else if (std::fabs(band - std::round(band)) * kStepNm >= 1e-6) {
+      between.push_back(nm);
+    }
+  }
+  std::string parts;
+  const std::pair<const std::vector<double>*, const char*> groups[] = {
+      {&below, " below 360 nm"}, {&between, " between the bands"}, {&above, " above 750 nm"}};
+  for (const auto& [group, where] : groups) {
+    if (group->empty()) continue;
+    if (!parts.empty()) parts += ", ";
+    parts += listed(*group) + where;
+  }
+  if (parts.empty()) return;
+  std::cerr << "kvdata: warning: " << file << ": not used: " << parts << "; only " << kBands
+            << " are used\n";
 }
 
 }  // namespace
@@ -66,9 +108,8 @@ std::array<std::size_t, 40> band_columns(const std::string& file,
   if (!missing.empty() && (!extend || inner_gap || first == 0)) {
     std::vector<double> ordered = wavelengths;
     std::sort(ordered.begin(), ordered.end());
-    std::string message =
-        file + ": the spectra cover " + coverage(ordered) +
-        "; the 40 bands from 360 to 750 nm at 10 nm are needed (missing: " + missing + " nm).";
+    std::string message = file + ": the spectra cover " + coverage(ordered) + "; " + kBands +
+                          " are needed (missing: " + missing + " nm).";
     if (inner_gap || first == 0) {
       message += " Bands missing inside the range cannot be filled.";
     } else {
@@ -81,6 +122,7 @@ std::array<std::size_t, 40> band_columns(const std::string& file,
     const int from = band < first ? first : band > last ? last : band;
     columns[static_cast<std::size_t>(band - 1)] = *column[from];
   }
+  warn_unused(file, wavelengths);
   return columns;
 }
 

@@ -2,7 +2,7 @@
 // From a file's spectra to the library's 40-band spectra: bands 1 to 40 are
 // 360 to 750 nm at 10 nm, reflectance in percent. A file must have a column
 // at each of those wavelengths (finer or wider ranges are fine: the other
-// columns are not used). A file that does not cover all 40 is refused with a
+// columns are not used, which a warning says). A file that does not cover all 40 is refused with a
 // message that says what it does cover; with `extend`, bands missing at
 // either end are filled by repeating the nearest measured band, the usual
 // practice; a gap inside the range is refused either way.
@@ -24,7 +24,9 @@ std::string coverage(const std::vector<double>& wavelengths);
 
 // For bands 1 to 40 (index 0 to 39), the index in `wavelengths` (any order,
 // no repeats) of the column whose value the band takes. InputError naming
-// `file` when the wavelengths do not cover the bands.
+// `file` when the wavelengths do not cover the bands; otherwise a warning on
+// standard error lists the wavelengths that are none of the bands (below,
+// between or above them), if any.
 std::array<std::size_t, 40> band_columns(const std::string& file,
                                          const std::vector<double>& wavelengths, bool extend);
 

@@ -12,9 +12,11 @@
 
 namespace kvdata::cli {
 
-// InputError carries Little CMS's own message (with the line it names) for a
-// file it cannot parse, and names the set and field of a missing or
-// non-numeric value.
+// InputError names the line of a set that does not hold one value for each
+// field of the data format, refuses a table of more sets than Little CMS
+// reads (kCgatsMostSets), gives Little CMS's reason, in the command's words
+// and with its line, for a file it cannot parse, and names the set and field
+// of a missing or non-numeric value.
 SpectraTable read_cgats(const std::string& path);
 
 }  // namespace kvdata::cli

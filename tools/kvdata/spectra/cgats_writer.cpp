@@ -92,11 +92,19 @@ void append_cgats_cell(std::string& out, const std::string& cell) {
   }
 }
 
+void check_cgats_sets(std::size_t sets) {
+  if (sets <= kCgatsMostSets) return;
+  bad_input("cannot write more than " + std::to_string(kCgatsMostSets) +
+            " sets to a CGATS file: Little CMS, which reads CGATS files, refuses a larger table; "
+            "CSV and JSON have no such limit");
+}
+
 std::string cgats_head(const std::string& descriptor, const std::vector<std::string>& fields,
                        std::size_t sets) {
+  check_cgats_sets(sets);
   LcmsContext context;
   It8Handle it8(context.get() == nullptr ? nullptr : cmsIT8Alloc(context.get()));
-  auto fail = [&] { bad_input("cannot write CGATS: " + context.messages()); };
+  auto fail = [&] { bad_input("cannot write CGATS: " + context.explained()); };
   if (!it8) fail();
   bool ok =
       cmsIT8SetSheetType(it8.get(), "CGATS.17") &&

@@ -25,7 +25,7 @@ std::string write_cgats(const std::string& descriptor, const std::vector<std::st
 // once: cgats_head() (the properties, NUMBER_OF_SETS `sets`, the data format
 // and BEGIN_DATA), then append_cgats_set() for each set, then cgats_tail().
 // A file without sets has no data section at all: Little CMS refuses an
-// empty one.
+// empty one. A table of more sets than check_cgats_sets() allows is refused.
 std::string cgats_head(const std::string& descriptor, const std::vector<std::string>& fields,
                        std::size_t sets);
 template <class Cells>
@@ -33,6 +33,11 @@ void append_cgats_set(std::string& out, const Cells& cells);
 inline const char* cgats_tail(std::size_t sets) {
   return sets > 0 ? "END_DATA\n" : "";
 }
+
+// InputError when a table of `sets` sets could not be read back: Little CMS
+// reads at most kCgatsMostSets. A writer that learns the count as it goes
+// calls this as it goes, so that it stops before doing all the work.
+void check_cgats_sets(std::size_t sets);
 
 // One cell of a set as it stands in the file.
 void append_cgats_cell(std::string& out, const std::string& cell);

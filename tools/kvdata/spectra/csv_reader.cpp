@@ -204,6 +204,7 @@ SpectraTable read_csv(const std::string& path, const std::string& text) {
   table.format = "CSV";
   CsvSpectraReader reader(path, CsvRecords(path, text));
   table.wavelengths = reader.wavelengths();
+  table.named = reader.named();
   std::vector<double> values(table.wavelengths.size());
   Progress progress("reading " + path, text.size(), std::size_t{1} << 20, "bytes");
   while (reader.next(values)) {

@@ -39,6 +39,8 @@ class CsvSpectraReader {
   // The current row's sample name, trimmed (empty when the file has none);
   // valid until the next call to next().
   std::string_view name() const { return name_; }
+  // True when a column names the samples.
+  bool named() const { return name_column_.has_value(); }
   // The line of the current row.
   std::size_t line() const { return records_.line(); }
   // Bytes of the file read so far.

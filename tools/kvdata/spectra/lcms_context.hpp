@@ -3,14 +3,20 @@
 // so that a failed parse can say what Little CMS found wrong. Internal to
 // spectra/.
 //
-//   LcmsContext ctx;  cmsHANDLE h = cmsIT8LoadFromFile(ctx.get(), path);
-//   if (!h) bad_input(path + ": " + ctx.messages());
+//   LcmsContext ctx;  cmsHANDLE h = cmsIT8LoadFromMem(ctx.get(), text.data(), size);
+//   if (!h) bad_input(path + ": not a readable CGATS file: " + ctx.explained());
 
 #include <lcms2.h>
 
+#include <cstddef>
 #include <string>
+#include <vector>
 
 namespace kvdata::cli {
+
+// The most sets (and fields) of a CGATS table that Little CMS reads; it
+// refuses a larger table whole.
+inline constexpr std::size_t kCgatsMostSets = 32766;
 
 class LcmsContext {
  public:
@@ -20,14 +26,16 @@ class LcmsContext {
   LcmsContext& operator=(const LcmsContext&) = delete;
 
   cmsContext get() const { return context_; }
-  // The messages reported so far, joined with "; ".
-  const std::string& messages() const { return messages_; }
+  // The messages reported so far in the command's words, joined with "; ":
+  // "line 12: ..." for a message that names its line, and what a message
+  // about Little CMS's internals means for the file.
+  std::string explained() const;
 
  private:
   static void collect(cmsContext context, cmsUInt32Number code, const char* text);
 
   cmsContext context_;
-  std::string messages_;
+  std::vector<std::string> messages_;
 };
 
 // Owns an IT8 handle.

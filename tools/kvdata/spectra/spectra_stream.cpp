@@ -44,6 +44,10 @@ SpectraStream::SpectraStream(const std::string& path, bool extend) : path_(path)
 
 SpectraStream::~SpectraStream() = default;
 
+bool SpectraStream::named() const {
+  return table_ ? table_->named : csv_->named();
+}
+
 bool SpectraStream::next(SpectraBlock& block, std::size_t max) {
   if (table_ && !started_) {
     started_ = true;
@@ -54,6 +58,7 @@ bool SpectraStream::next(SpectraBlock& block, std::size_t max) {
   }
   block.bands.resize(40 * max);
   if (block.labels.size() < max) block.labels.resize(max);
+  block.named.resize(max);
   std::size_t n = 0;
   if (table_) {
     for (; n < max && count_ + n < table_->rows.size(); ++n) {
@@ -62,6 +67,7 @@ bool SpectraStream::next(SpectraBlock& block, std::size_t max) {
         block.bands[40 * n + b] = static_cast<Single>(row.values[columns_[b]]);
       }
       block.labels[n] = table_->label(row);
+      block.named[n] = !row.name.empty();
     }
   } else {
     // The block's rows are read whole before any is mapped onto the bands,
@@ -73,6 +79,7 @@ bool SpectraStream::next(SpectraBlock& block, std::size_t max) {
       if (!csv_->next(row)) break;
       for (double v : row) highest_ = std::max(highest_, v);
       const std::string_view name = csv_->name();
+      block.named[n] = !name.empty();
       if (name.empty()) {
         block.labels[n] = "line " + std::to_string(csv_->line());
       } else {

@@ -28,6 +28,7 @@ struct SpectraBlock {
   std::size_t count = 0;
   std::vector<Single> bands;        // 40 per spectrum, band 1 (360 nm) first
   std::vector<std::string> labels;  // per spectrum: its name, or "line 5" / "set 3"
+  std::vector<bool> named;          // per spectrum: whether its label is its name
 };
 
 class SpectraStream {
@@ -48,6 +49,9 @@ class SpectraStream {
   bool next(SpectraBlock& block, std::size_t max);
 
   const std::string& file() const { return path_; }
+  // True when the file has a column or field of sample names (a row may
+  // still leave its name empty).
+  bool named() const;
   // Spectra handed out so far.
   std::size_t count() const { return count_; }
   // The highest value read so far (0 when none is positive).

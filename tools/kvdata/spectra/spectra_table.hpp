@@ -23,6 +23,7 @@ struct SpectraTable {
   std::string format;               // "CSV" or "CGATS"
   std::vector<double> wavelengths;  // nm, ascending, no repeats
   std::vector<SpectrumRow> rows;
+  bool named = false;  // the file has a column or field of sample names
 
   // "white.csv line 5" or "white.cgats set 3".
   std::string where(const SpectrumRow& row) const;
