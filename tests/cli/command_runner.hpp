@@ -13,6 +13,7 @@
 #include <filesystem>
 #include <fstream>
 #include <iterator>
+#include <sstream>
 #include <string>
 #include <vector>
 
@@ -37,6 +38,26 @@ inline void spill(const std::filesystem::path& p, const std::string& bytes) {
 
 inline std::string example(const std::string& relative) {
   return std::string(KVDATA_SOURCE_DIR) + "/examples/" + relative;
+}
+
+// The rows of a table in tests/cli/data: the cells of each line that is
+// neither blank nor a comment, split at "|" and trimmed.
+inline std::vector<std::vector<std::string>> table_rows(const std::string& name) {
+  std::ifstream in(std::string(KVDATA_SOURCE_DIR) + "/tests/cli/data/" + name);
+  std::vector<std::vector<std::string>> rows;
+  for (std::string line; std::getline(in, line);) {
+    if (line.empty() || line[0] == '#') continue;
+    std::vector<std::string> cells;
+    std::stringstream parts(line + " ");
+    for (std::string cell; std::getline(parts, cell, '|');) {
+      const auto first = cell.find_first_not_of(' ');
+      cells.push_back(first == std::string::npos
+                          ? ""
+                          : cell.substr(first, cell.find_last_not_of(' ') - first + 1));
+    }
+    rows.push_back(std::move(cells));
+  }
+  return rows;
 }
 
 // A scratch folder of its own for each test, removed afterwards.
