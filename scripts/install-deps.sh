@@ -9,7 +9,7 @@ packages=(
   libgtest-dev libgmock-dev libbenchmark-dev
   libcli11-dev nlohmann-json3-dev liblcms2-dev libxml2-dev
   pybind11-dev python3-dev python3-numpy python3-pytest
-  jq time
+  jq time help2man
 )
 
 missing=()

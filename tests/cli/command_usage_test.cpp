@@ -1,6 +1,10 @@
 // Help, exit codes and usage errors of the kvdata command.
 #include <gtest/gtest.h>
 
+#include <string>
+#include <utility>
+#include <vector>
+
 #include "command_runner.hpp"
 
 namespace kvdata::cli {
@@ -22,30 +26,52 @@ TEST(CommandUsage, EverySubcommandHasHelpWithAnExample) {
   }
 }
 
-TEST(CommandUsage, BadUsageExitsWithTwoAndBadInputWithOne) {
-  EXPECT_EQ(kvdata({}).code, 2);
-  EXPECT_EQ(kvdata({"frobnicate"}).code, 2);
-  auto r = kvdata({"decode", "users", example("streams/user.kvs")});
-  EXPECT_EQ(r.code, 2);
-  EXPECT_NE(r.err.find("unknown KIND \"users\"; KIND is one of: user, tolerance"),
-            std::string::npos);
-  EXPECT_EQ(kvdata({"encode", example("json/user.json")}).code, 2);  // -o is required
-  EXPECT_EQ(kvdata({"colour", example("spectra/tiles.csv"), "--format", "xml"}).code, 2);
-  EXPECT_EQ(
-      kvdata({"plot", example("streams/scpair.kvs"), "-o", "/tmp/x.svg", "--sc", "both!"}).code, 2);
-  {
-    test::Scratch s;
-    test::spill(s.path("empty.kvs"), "");
-    r = kvdata({"decode", "station", s.path("empty.kvs")});
-    EXPECT_EQ(r.code, 1);
-    EXPECT_NE(r.err.find("empty.kvs: is empty"), std::string::npos) << r.err;
+// One line of tests/cli/data/command-lines.txt.
+struct CommandLine {
+  int code = 0;
+  std::string stream;  // "out" or "err"
+  std::string text;    // "!text": the stream does not hold it
+  std::vector<std::string> args;
+};
+
+std::vector<CommandLine> command_lines() {
+  const std::string data = std::string(KVDATA_SOURCE_DIR) + "/tests/cli/data";
+  std::vector<CommandLine> lines;
+  for (const auto& cells : test::read_table("command-lines.txt")) {
+    if (cells.size() != 4) {
+      ADD_FAILURE() << "not four cells: " << cells[0];
+      continue;
+    }
+    CommandLine c{std::stoi(cells[0]), cells[1], cells[2], {}};
+    std::stringstream words(cells[3]);
+    for (std::string w; words >> w;) {
+      for (const auto& [from, to] :
+           {std::pair<std::string, std::string>{"{ex}", example("")}, {"{data}", data + "/"}}) {
+        if (w.starts_with(from)) w = to + w.substr(from.size());
+      }
+      c.args.push_back(w);
+    }
+    lines.push_back(std::move(c));
   }
-  r = kvdata({"explain", "/nonexistent/stream.kvs"});
-  EXPECT_EQ(r.code, 1);
-  EXPECT_NE(r.err.find("/nonexistent/stream.kvs: cannot open"), std::string::npos);
-  r = kvdata({"encode", example("json/user.json"), "-o", "/nonexistent/dir/user.kvs"});
-  EXPECT_EQ(r.code, 1);
-  EXPECT_NE(r.err.find("/nonexistent/dir/user.kvs"), std::string::npos);
+  return lines;
+}
+
+TEST(CommandUsage, EachCommandLineGivesItsExitCodeAndMessage) {
+  const auto lines = command_lines();
+  EXPECT_GE(lines.size(), 25u);
+  for (const CommandLine& c : lines) {
+    std::string shown;
+    for (const std::string& a : c.args) shown += " " + a;
+    SCOPED_TRACE("kvdata" + shown);
+    const auto r = kvdata(c.args);
+    EXPECT_EQ(r.code, c.code) << r.err;
+    const std::string& stream = c.stream == "out" ? r.out : r.err;
+    if (c.text.starts_with('!')) {
+      EXPECT_EQ(stream.find(c.text.substr(2)), std::string::npos) << stream;
+    } else {
+      EXPECT_NE(stream.find(c.text), std::string::npos) << stream;
+    }
+  }
 }
 
 }  // namespace

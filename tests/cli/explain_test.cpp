@@ -56,15 +56,6 @@ TEST(Explain, EveryExampleIsTiledByTheFieldsItsReaderTakesAndIdentifiedWithoutKi
   }
 }
 
-TEST(Explain, StreamsThatFitNoKindOrSeveralAreNotIdentified) {
-  ByteArray odd(0, 4);
-  const Identification none = identify(odd);
-  EXPECT_FALSE(none.kind);
-  EXPECT_NE(none.reason.find("no kind of stream fits these 5 bytes; the closest is"),
-            std::string::npos)
-      << none.reason;
-}
-
 // Runs `write` with a width check installed; the message it raised, or "".
 template <class Write>
 std::string refusal(const Write& write) {

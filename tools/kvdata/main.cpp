@@ -4,48 +4,50 @@
 
 #include <exception>
 #include <iostream>
+#include <string_view>
 
-#include "commands/commands.hpp"
+#include "commands/app.hpp"
 #include "kvdata/automation/error.hpp"
-#include "kvdata/automation/event_log.hpp"
-#include "kvdata/automation/text.hpp"
 #include "support/errors.hpp"
+#include "support/library_log.hpp"
+#include "support/notes.hpp"
+
+namespace {
+
+// The command's message, with the library's log entries of this run folded
+// under it.
+int failed(const kvdata::cli::RunLog& log, const char* message, int code) {
+  std::cerr << "kvdata: " << message << '\n' << log.folded(kvdata::cli::verbose());
+  return code;
+}
+
+}  // namespace
 
 int main(int argc, char** argv) {
   using namespace kvdata::cli;
-  // The library's event-log entries (field-codec failures) go to standard
-  // error rather than the system log: they belong to this run.
-  kvdata::EventLog::SetSink([](const kvdata::String& text) {
-    std::cerr << "kvdata: library: " << kvdata::to_utf8(text) << '\n';
-  });
-
-  CLI::App app{"kvdata: inspect, convert, compute and plot KVData streams and measurements"};
-  app.require_subcommand(1);
-  app.footer("Run 'kvdata SUBCOMMAND --help' for the options and an example of each.");
-  add_decode(app);
-  add_encode(app);
-  add_explain(app);
-  add_plot(app);
-  add_colour(app);
-  add_spread(app);
-
+  // The library's event-log entries (field-codec failures) belong to this
+  // run: they are kept for the end rather than sent to the system log.
+  const RunLog log;
+  const auto app = make_app(KVDATA_VERSION);
+  if (argc == 2 && std::string_view(argv[1]) == "--completion-words") {
+    std::cout << completion_words(*app);
+    return kExitOk;
+  }
   try {
-    app.parse(argc, argv);
+    check_subcommand(*app, argc, argv);
+    app->parse(argc, argv);
   } catch (const CLI::ParseError& e) {
-    const int code = app.exit(e);
+    const int code = app->exit(e);
     return code == 0 ? kExitOk : kExitBadUsage;
   } catch (const UsageError& e) {
-    std::cerr << "kvdata: " << e.what() << '\n';
-    return kExitBadUsage;
+    return failed(log, e.what(), kExitBadUsage);
   } catch (const InputError& e) {
-    std::cerr << "kvdata: " << e.what() << '\n';
-    return kExitBadInput;
+    return failed(log, e.what(), kExitBadInput);
   } catch (const kvdata::Error& e) {
-    std::cerr << "kvdata: " << e.what() << '\n';
-    return kExitBadInput;
+    return failed(log, e.what(), kExitBadInput);
   } catch (const std::exception& e) {
-    std::cerr << "kvdata: " << e.what() << '\n';
-    return kExitBadInput;
+    return failed(log, e.what(), kExitBadInput);
   }
+  std::cerr << log.folded(verbose());
   return kExitOk;
 }

@@ -9,9 +9,14 @@ namespace kvdata::cli {
 namespace {
 
 struct EncodeOptions {
-  std::vector<std::string> args;
+  StreamArgs args;
   std::string output;
 };
+
+// Its name ends in ".kvs" or it holds a zero byte.
+bool looks_like_stream(const std::string& file, const std::string& text) {
+  return file.ends_with(".kvs") || text.find('\0') != std::string::npos;
+}
 
 void run_encode(const EncodeOptions& o) {
   const auto [given, file] = kind_and_file(o.args);
@@ -22,6 +27,13 @@ void run_encode(const EncodeOptions& o) {
   } catch (const Json::exception& e) {
     // Syntax errors, and also numbers beyond the range of a double ("1E400"),
     // which the parser reports as out of range rather than as a parse error.
+    // A stream given by mistake: the parser's words would show its bytes.
+    if (looks_like_stream(file, text)) {
+      bad_input(file +
+                ": not a JSON document; it looks like a stream. To see it as JSON: "
+                "kvdata decode " +
+                file);
+    }
     bad_input(file + ": not valid JSON: " + e.what());
   }
   std::vector<Byte> bytes;
@@ -38,12 +50,11 @@ void run_encode(const EncodeOptions& o) {
 void add_encode(CLI::App& app) {
   auto o = std::make_shared<EncodeOptions>();
   CLI::App* cmd = app.add_subcommand("encode", "Write the stream of a JSON document");
-  cmd->add_option("args", o->args,
-                  "[KIND] FILE.json: the kind of stream (optional: the document's \"kind\") and "
-                  "the JSON file")
-      ->required()
-      ->expected(1, 2);
-  cmd->add_option("-o,--output", o->output, "The stream file to write")->required();
+  add_stream_args(*cmd, o->args, "FILE.json",
+                  "FILE.json: the JSON document (KIND is then checked against its \"kind\")");
+  cmd->add_option("-o,--output", o->output, "The stream file to write")
+      ->type_name("OUT")
+      ->required();
   cmd->footer(
       "The document has the form that decode writes. Nothing is written unless the whole\n"
       "stream could be made; the output replaces OUT in one step.\n\n"

@@ -12,7 +12,7 @@ namespace kvdata::cli {
 namespace {
 
 struct ExplainOptions {
-  std::vector<std::string> args;
+  StreamArgs args;
   bool json = false;
   std::string output;
 };
@@ -33,11 +33,10 @@ void add_explain(CLI::App& app) {
   auto o = std::make_shared<ExplainOptions>();
   CLI::App* cmd = app.add_subcommand(
       "explain", "Show a stream field by field: offset, width, raw bytes, decoded value");
-  cmd->add_option("args", o->args, "[KIND] FILE: the kind of stream (optional) and the stream file")
-      ->required()
-      ->expected(1, 2);
+  add_stream_args(*cmd, o->args, "FILE", "FILE: the stream file");
   cmd->add_flag("--json", o->json, "Write the fields as JSON instead of a table");
-  cmd->add_option("-o,--output", o->output, "Write to this file instead of standard output");
+  cmd->add_option("-o,--output", o->output, "Write to this file instead of standard output")
+      ->type_name("FILE");
   cmd->footer(
       "On a damaged stream the walk stops at the first field that cannot be read or does\n"
       "not fit, says what was expected there, and the command exits with 1.\n\n"

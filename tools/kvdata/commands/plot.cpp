@@ -17,7 +17,7 @@ namespace kvdata::cli {
 namespace {
 
 struct PlotOptions {
-  std::vector<std::string> args;
+  StreamArgs args;
   std::string output;
   std::string sc = "both";
 };
@@ -229,9 +229,7 @@ void run_plot(const PlotOptions& o) {
 void add_plot(CLI::App& app) {
   auto o = std::make_shared<PlotOptions>();
   CLI::App* cmd = app.add_subcommand("plot", "Draw the spectra inside a stream as an SVG chart");
-  cmd->add_option("args", o->args, "[KIND] FILE: the kind of stream (optional) and the stream file")
-      ->required()
-      ->expected(1, 2);
+  add_stream_args(*cmd, o->args, "FILE", "FILE: the stream file");
   cmd->add_option("-o,--output", o->output, "The SVG file to write")->required();
   cmd->add_option("--sc", o->sc, "Which spectra of each pair: SCE, SCI or both (default)")
       ->check(CLI::IsMember({"SCE", "SCI", "both"}));

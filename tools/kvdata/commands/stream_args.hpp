@@ -1,10 +1,12 @@
 #pragma once
-// Shared by the commands that read a stream: the optional KIND before FILE,
-// and the identification of the stream when KIND is left out.
+// Shared by the commands that read a stream or a document: the optional KIND
+// before FILE, and the identification of the stream when KIND is left out.
 //
-//   auto [kind, file] = kind_and_file(args);        // "user x.kvs" or "x.kvs"
+//   add_stream_args(*cmd, o->args, "FILE", "the stream file");   // usage: [KIND] FILE
+//   auto [kind, file] = kind_and_file(o.args);                   // "user x.kvs" or "x.kvs"
 //   StreamKind k = resolve_kind(kind, bytes, file, "decode");
 
+#include <CLI/CLI.hpp>
 #include <optional>
 #include <span>
 #include <string>
@@ -16,23 +18,41 @@
 
 namespace kvdata::cli {
 
+// The words after the subcommand that are not options, and the command's
+// usage ("kvdata decode [KIND] FILE") for messages about them.
+struct StreamArgs {
+  std::vector<std::string> words;
+  std::string usage;
+};
+
+// Adds the positional [KIND] FILE arguments to `cmd`, shown as "[KIND]
+// <file_word>" in its usage line and help; `help` says what FILE is.
+void add_stream_args(CLI::App& cmd, StreamArgs& args, const std::string& file_word,
+                     const std::string& help);
+
 struct KindAndFile {
   std::optional<StreamKind> kind;
   std::string file;
 };
 
-// One argument: FILE; two: KIND FILE. An unknown KIND is a UsageError.
-KindAndFile kind_and_file(const std::vector<std::string>& args);
+// One word: FILE; two: KIND FILE. UsageError, with the usage line, for no
+// word or more than two, and (listing the kinds) for an unknown KIND.
+KindAndFile kind_and_file(const StreamArgs& args);
 
 // The KIND word; UsageError listing the kinds when it is not one.
 StreamKind require_kind(const std::string& word);
 
 // `kind` when given; otherwise the identified kind, announced on standard
-// error. When the stream cannot be told, a UsageError asks for KIND; an empty
-// file is an InputError either way.
+// error (a note: -q silences it). When the stream cannot be told, a
+// UsageError asks for KIND; an empty file is an InputError either way.
 StreamKind resolve_kind(std::optional<StreamKind> kind, const ByteArray& bytes,
                         const std::string& file, const std::string& command);
 StreamKind resolve_kind(std::optional<StreamKind> kind, std::span<const Byte> bytes,
                         const std::string& file, const std::string& command);
+
+// For messages about a stream that does not read: a line that points to
+// `kvdata encode` when the file looks like a JSON document (its name ends in
+// ".json" or its first non-blank byte is "{"), else "".
+std::string json_hint(const std::string& file, std::span<const Byte> bytes);
 
 }  // namespace kvdata::cli

@@ -184,6 +184,7 @@ bool CsvSpectraReader::next(std::span<double> values) {
               std::to_string(titles_.size()));
   }
   name_ = name_column_ ? trim(cells[*name_column_]) : std::string_view{};
+  check_sample_name(name_, path_ + " line " + std::to_string(records_.line()));
   const std::size_t n = spectral_.size();
   const bool padded = records_.cells_in_block();
   for (std::size_t i = 0; i < n; ++i) {

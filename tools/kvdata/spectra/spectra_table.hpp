@@ -8,6 +8,7 @@
 
 #include <cstddef>
 #include <string>
+#include <string_view>
 #include <vector>
 
 namespace kvdata::cli {
@@ -39,6 +40,10 @@ SpectraTable read_spectra(const std::string& path);
 // "360nm", "SPECTRAL_NM360" or "SPECTRAL_360"; negative when the name holds
 // no wavelength from 300 to 1100 nm.
 double wavelength_of(const std::string& column);
+
+// InputError naming `where` ("white.csv line 5") when a sample name is not
+// UTF-8 text, which no JSON, SVG or CGATS output could carry.
+void check_sample_name(std::string_view name, const std::string& where);
 
 // Sorts the spectral columns by wavelength (rows follow); InputError when a
 // wavelength appears twice.

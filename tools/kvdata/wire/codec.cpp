@@ -19,10 +19,12 @@ std::string member_path(const std::string& path, std::string_view name) {
   return path.empty() ? std::string(name) : path + "." + std::string(name);
 }
 
+// The library's entries about the refusal stay with the run's log.
 [[noreturn]] void refused(StreamKind kind, const char* what, const std::string& message,
-                          const LibraryLog& log) {
+                          LibraryLog& log) {
+  log.keep();
   bad_input("the library's " + std::string(kind_name(kind)) + " " + what +
-            (message.empty() ? std::string() : ": " + message) + log.summary());
+            (message.empty() ? std::string() : ": " + message));
 }
 
 // --- Spectra ------------------------------------------------------------------------

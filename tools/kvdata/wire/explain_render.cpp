@@ -10,6 +10,7 @@
 #include "json/numbers.hpp"
 #include "kvdata/automation/text.hpp"
 #include "kvdata/foundation/record_fields.hpp"
+#include "support/library_log.hpp"
 
 namespace kvdata::cli {
 namespace {
@@ -207,7 +208,10 @@ std::string value_text(const StreamField& f, std::span<const Byte> stream) {
 WalkEnd explain_table(StreamKind kind, const ByteArray& bytes, OutputFile& out) {
   const std::span<const Byte> stream = whole(bytes);
   LongestPath longest;
-  static_cast<void>(walk_stream(kind, bytes, longest));
+  {
+    const LibraryLog drop;  // the walk below keeps them
+    static_cast<void>(walk_stream(kind, bytes, longest));
+  }
   const std::size_t size_digits = digits(stream.size());
   // A walk that stops names the field where it stops: a path no longer than
   // the longest one walked, or a description of what follows the encoding.

@@ -6,6 +6,7 @@
 #include "json/numbers.hpp"
 #include "kvdata/foundation/record_fields.hpp"
 #include "kvdata/objects/kv_test_run.hpp"
+#include "support/library_log.hpp"
 #include "wire/stream_walk.hpp"
 
 namespace kvdata::cli {
@@ -19,15 +20,23 @@ enum class Evidence {
   StampAndName = 3,  // a version stamp and a record name matched
 };
 
-// Keeps the Single the reader took first, at offset 0: the version stamp of
-// the kinds that have one.
-class FirstSingle : public WalkSink {
+// Keeps the Single the reader took first, at offset 0 (the version stamp of
+// the kinds that have one), and where the stamp and the record name end.
+class Marks : public WalkSink {
  public:
   void field(std::string_view, const StreamField& f) override {
-    if (f.position != 0) return;
-    if (const auto* v = std::get_if<Single>(&f.value)) stamp = *v;
+    const auto end = static_cast<std::size_t>(f.position + f.width);
+    if (f.position == 0) {
+      if (const auto* v = std::get_if<Single>(&f.value)) {
+        stamp = *v;
+        stamp_end = end;
+      }
+    }
+    if (f.name == stream_names::kRecordName) name_end = end;
   }
   std::optional<Single> stamp;
+  std::size_t stamp_end = 0;
+  std::size_t name_end = 0;
 };
 
 struct Fit {
@@ -82,27 +91,63 @@ Fit evidence(StreamKind kind, std::optional<Single> stamp, std::size_t size) {
   return {kind, Evidence::Length, length_text(size)};
 }
 
+// A kind that does not fit, and whether the reader took its stamp (and
+// record name) before it stopped: then the bytes say they are of that kind.
+struct Miss {
+  StreamKind kind;
+  Problem problem;
+  std::optional<Fit> stamped;
+};
+
+// Where the stream stops for `m`, and how much is left from there.
+std::string stop_text(const Miss& m, std::size_t size) {
+  std::string text = "stops at offset " + std::to_string(m.problem.offset) + " (" +
+                     m.problem.field + ": expected " + m.problem.expected + ")";
+  if (m.problem.field != stream_names::kEndOfStream) {
+    text +=
+        "; " + std::to_string(size - std::min(size, m.problem.offset)) + " bytes follow from there";
+  }
+  return text;
+}
+
 }  // namespace
 
 Identification identify(const ByteArray& bytes) {
   const std::size_t size = bytes.has_bounds() ? bytes.size() : 0;
   std::vector<Fit> fits;
-  std::optional<std::pair<StreamKind, Problem>> closest;
+  std::optional<Miss> closest;
+  // Trying the kinds that do not fit leaves nothing in the run's log.
+  const LibraryLog trials;
   for (const KindInfo& k : all_kinds()) {
-    FirstSingle first;
-    WalkEnd end = walk_stream(k.kind, bytes, first);
+    Marks marks;
+    WalkEnd end = walk_stream(k.kind, bytes, marks);
+    Fit fit = evidence(k.kind, marks.stamp, size);
     if (!end.problem) {
-      fits.push_back(evidence(k.kind, first.stamp, size));
-    } else if (!closest || end.problem->offset > closest->second.offset) {
-      closest.emplace(k.kind, std::move(*end.problem));
+      fits.push_back(std::move(fit));
+      continue;
     }
+    const bool named = k.kind == StreamKind::Profile || k.kind == StreamKind::ProfileRecord;
+    const std::size_t told = named ? marks.name_end : marks.stamp_end;
+    Miss miss{k.kind, std::move(*end.problem), std::nullopt};
+    if (fit.evidence >= Evidence::Stamp && told > 0 && miss.problem.offset >= told) {
+      miss.stamped = std::move(fit);
+    }
+    // A kind whose stamp was taken is closer than any without; then the
+    // one that reads further.
+    const bool closer = !closest || (miss.stamped.has_value() != closest->stamped.has_value()
+                                         ? miss.stamped.has_value()
+                                         : miss.problem.offset > closest->problem.offset);
+    if (closer) closest = std::move(miss);
   }
   if (fits.empty()) {
     std::string reason = "no kind of stream fits these " + std::to_string(size) + " bytes";
-    if (closest) {
-      reason += "; the closest is " + std::string(kind_name(closest->first)) +
-                ", which stops at offset " + std::to_string(closest->second.offset) + " (" +
-                closest->second.field + ": expected " + closest->second.expected + ")";
+    if (closest && closest->stamped) {
+      reason += "; going by " + closest->stamped->text + ", this is a " +
+                std::string(kind_name(closest->kind)) + " stream, which " +
+                stop_text(*closest, size);
+    } else if (closest) {
+      reason += "; the closest is " + std::string(kind_name(closest->kind)) + ", which " +
+                stop_text(*closest, size);
     }
     return {std::nullopt, reason};
   }

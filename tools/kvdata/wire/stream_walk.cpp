@@ -81,8 +81,8 @@ WalkEnd walk_stream(StreamKind kind, const ByteArray& bytes, WalkSink& sink) {
   bool accepted = false;
   Long end = 0;
   std::string message;
-  // The reader's event-log entry on a refusal says less than the observer
-  // was told; it is kept for the refusal that the observer was not told.
+  // The reader's event-log entries stay with the run when the walk finds
+  // a problem (they are shown under the command's message with -v).
   LibraryLog log;
   {
     const ObservedStreams watch(walker);
@@ -97,11 +97,11 @@ WalkEnd walk_stream(StreamKind kind, const ByteArray& bytes, WalkSink& sink) {
     walker.rethrow();
   } else if (!walker.problem_) {
     // A refusal the reader did not explain (it ran out of memory, say).
-    walker.problem_ =
-        Problem{walker.end_, std::string(kind_name(kind)),
-                "what the library's reader could take; it refused the stream here" +
-                    (message.empty() ? std::string() : ": " + message) + log.summary()};
+    walker.problem_ = Problem{walker.end_, std::string(kind_name(kind)),
+                              "what the library's reader could take; it refused the stream here" +
+                                  (message.empty() ? std::string() : ": " + message)};
   }
+  if (walker.problem_) log.keep();
   return WalkEnd{std::move(walker.problem_), walker.end_};
 }
 
@@ -129,7 +129,7 @@ class FindOffset : public WalkSink {
     const auto at = static_cast<std::size_t>(f.position);
     if (found_.empty() && offset_ >= at && offset_ < at + static_cast<std::size_t>(f.width)) {
       found_ = std::string(path) + " (offset " + std::to_string(at) + ", " +
-               std::to_string(f.width) + " bytes)";
+               std::to_string(f.width) + (f.width == 1 ? " byte)" : " bytes)");
     }
   }
   std::size_t offset_;
@@ -145,15 +145,14 @@ class Ignore : public WalkSink {
 
 std::string field_at(StreamKind kind, std::span<const Byte> bytes, std::size_t offset) {
   FindOffset find(offset);
+  LibraryLog drop;  // a second look at the stream
   static_cast<void>(walk_stream(kind, array_of(bytes), find));
-  return find.found_.empty() ? "offset " + std::to_string(offset) : find.found_;
+  return find.found_;
 }
 
-std::optional<std::string> stream_problem(StreamKind kind, std::span<const Byte> bytes) {
+WalkEnd walk_stream(StreamKind kind, const ByteArray& bytes) {
   Ignore ignore;
-  const WalkEnd end = walk_stream(kind, array_of(bytes), ignore);
-  if (!end.problem) return std::nullopt;
-  return verdict(kind, end, bytes.size());
+  return walk_stream(kind, bytes, ignore);
 }
 
 }  // namespace kvdata::cli

@@ -44,16 +44,17 @@ struct WalkEnd {
 };
 
 // Offsets count from the array's lower bound. An error the sink raises
-// stops the walk and is raised again once the reader has returned.
+// stops the walk and is raised again once the reader has returned. When
+// there is a problem the library's log entries are kept (library_log.hpp).
 WalkEnd walk_stream(StreamKind kind, const ByteArray& bytes, WalkSink& sink);
 
 // One line: "The whole stream reads as KIND (N bytes)." or where it stops and why.
 std::string verdict(StreamKind kind, const WalkEnd& end, std::size_t size);
 
 // For messages about a stream: the field that holds byte `offset`,
-// "TS.Tiles(2).Name (offset 170, 9 bytes)", or "offset N" outside every field.
+// "TS.Tiles(2).Name (offset 170, 9 bytes)", or "" outside every field.
 std::string field_at(StreamKind kind, std::span<const Byte> bytes, std::size_t offset);
-// The verdict of a walk that finds a problem, or nothing.
-std::optional<std::string> stream_problem(StreamKind kind, std::span<const Byte> bytes);
+// A walk that only looks for the problem.
+WalkEnd walk_stream(StreamKind kind, const ByteArray& bytes);
 
 }  // namespace kvdata::cli
