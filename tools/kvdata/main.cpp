@@ -4,15 +4,18 @@
 
 #include <exception>
 #include <iostream>
+#include <new>
 
 #include "commands/commands.hpp"
 #include "kvdata/automation/error.hpp"
 #include "kvdata/automation/event_log.hpp"
 #include "kvdata/automation/text.hpp"
 #include "support/errors.hpp"
+#include "support/files.hpp"
 
 int main(int argc, char** argv) {
   using namespace kvdata::cli;
+  install_signal_cleanup();
   // The library's event-log entries (field-codec failures) go to standard
   // error rather than the system log: they belong to this run.
   kvdata::EventLog::SetSink([](const kvdata::String& text) {
@@ -42,6 +45,10 @@ int main(int argc, char** argv) {
     return kExitBadInput;
   } catch (const kvdata::Error& e) {
     std::cerr << "kvdata: " << e.what() << '\n';
+    return kExitBadInput;
+  } catch (const std::bad_alloc&) {
+    const std::string what = Activity::current();
+    std::cerr << "kvdata: " << (what.empty() ? "" : what + ": ") << "out of memory\n";
     return kExitBadInput;
   } catch (const std::exception& e) {
     std::cerr << "kvdata: " << e.what() << '\n';

@@ -6,7 +6,6 @@
 #include "kvdata/automation/error.hpp"
 #include "support/errors.hpp"
 #include "support/files.hpp"
-#include "support/output_file.hpp"
 #include "wire/codec.hpp"
 #include "wire/stream_walk.hpp"
 
@@ -55,9 +54,10 @@ void check_round_trip(StreamState& state, std::span<const Byte> bytes, const std
 
 void run_decode(const DecodeOptions& o) {
   const auto [given, file] = kind_and_file(o.args);
+  refuse_output_among_inputs({o.output}, {file});
   ByteArray stream = read_byte_array(file);
   const std::span<const Byte> bytes = bytes_of(stream);
-  const StreamKind kind = resolve_kind(given, bytes, file, "decode");
+  const StreamKind kind = resolve_kind(given, stream, file, "decode");
   std::unique_ptr<StreamState> state;
   try {
     state = decode_stream(kind, stream);

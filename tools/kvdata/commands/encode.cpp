@@ -1,6 +1,7 @@
 // kvdata encode [KIND] FILE.json -o OUT: the stream of a JSON document.
 #include "commands/commands.hpp"
 #include "commands/stream_args.hpp"
+#include "json/json_file.hpp"
 #include "support/errors.hpp"
 #include "support/files.hpp"
 #include "wire/codec.hpp"
@@ -15,22 +16,15 @@ struct EncodeOptions {
 
 void run_encode(const EncodeOptions& o) {
   const auto [given, file] = kind_and_file(o.args);
-  const std::string text = read_text(file);
-  Json doc;
-  try {
-    doc = Json::parse(text);
-  } catch (const Json::exception& e) {
-    // Syntax errors, and also numbers beyond the range of a double ("1E400"),
-    // which the parser reports as out of range rather than as a parse error.
-    bad_input(file + ": not valid JSON: " + e.what());
-  }
+  refuse_output_among_inputs({o.output}, {file});
+  const Json doc = read_json_file(file);
   std::vector<Byte> bytes;
   try {
     bytes = encode_stream(document_kind(doc, given), doc);
   } catch (const InputError& e) {
     bad_input(file + ": " + e.what());
   }
-  write_atomically(o.output, bytes);
+  write_output(o.output, bytes);
 }
 
 }  // namespace

@@ -105,6 +105,7 @@ std::vector<Point> points(const std::array<Single, 40>& values) {
 }
 
 void run_spread(const SpreadOptions& o) {
+  refuse_output_among_inputs({o.output, o.svg}, {o.white, o.blue});
   const std::vector<tSpectrum> white = to_bands(read_spectra(o.white), o.extend);
   const std::vector<tSpectrum> blue = to_bands(read_spectra(o.blue), o.extend);
   for (const auto* tile : {&white, &blue}) {
@@ -210,7 +211,7 @@ void run_spread(const SpreadOptions& o) {
       chart.add_band(name, colours[t], points(rows[t].lowest), points(rows[t].highest));
       chart.add_line(name, colours[t], points(rows[t].average));
     }
-    write_atomically(o.svg, chart.render());
+    write_output(o.svg, chart.render());
   }
   write_output(o.output, text);
 }

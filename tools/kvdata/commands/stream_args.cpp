@@ -10,21 +10,13 @@ namespace kvdata::cli {
 
 StreamKind require_kind(const std::string& word) {
   if (auto kind = parse_kind(word)) return *kind;
-  bad_usage("unknown KIND \"" + word + "\"; KIND is one of: " + kind_list());
+  bad_usage("unknown KIND " + quote(word) + "; KIND is one of: " + kind_list());
 }
 
 KindAndFile kind_and_file(const std::vector<std::string>& args) {
   if (args.size() == 1) return {std::nullopt, args[0]};
   if (args.size() == 2) return {require_kind(args[0]), args[1]};
   bad_usage("expected [KIND] FILE");
-}
-
-StreamKind resolve_kind(std::optional<StreamKind> kind, std::span<const Byte> bytes,
-                        const std::string& file, const std::string& command) {
-  if (kind && !bytes.empty()) return *kind;
-  ByteArray a(0, static_cast<Long>(bytes.size()) - 1);
-  std::copy(bytes.begin(), bytes.end(), a.begin());
-  return resolve_kind(kind, a, file, command);
 }
 
 StreamKind resolve_kind(std::optional<StreamKind> kind, const ByteArray& bytes,

@@ -32,7 +32,5 @@ StreamKind require_kind(const std::string& word);
 // file is an InputError either way.
 StreamKind resolve_kind(std::optional<StreamKind> kind, const ByteArray& bytes,
                         const std::string& file, const std::string& command);
-StreamKind resolve_kind(std::optional<StreamKind> kind, std::span<const Byte> bytes,
-                        const std::string& file, const std::string& command);
 
 }  // namespace kvdata::cli

@@ -8,6 +8,7 @@
 
 #include "spectra/lcms_context.hpp"
 #include "support/errors.hpp"
+#include "support/files.hpp"
 #include "support/progress.hpp"
 
 namespace kvdata::cli {
@@ -28,12 +29,17 @@ std::optional<double> number(const char* text) {
 }  // namespace
 
 SpectraTable read_cgats(const std::string& path) {
+  return read_cgats(path, read_text(path));
+}
+
+SpectraTable read_cgats(const std::string& path, std::string_view text) {
   SpectraTable table;
   table.file = path;
   table.format = "CGATS";
   LcmsContext context;
   if (context.get() == nullptr) bad_input(path + ": cannot start Little CMS");
-  It8Handle it8(cmsIT8LoadFromFile(context.get(), path.c_str()));
+  It8Handle it8(
+      cmsIT8LoadFromMem(context.get(), text.data(), static_cast<cmsUInt32Number>(text.size())));
   if (!it8) {
     bad_input(path + ": not a readable CGATS file" +
               (context.messages().empty() ? std::string() : ": " + context.messages()));
@@ -85,9 +91,9 @@ SpectraTable read_cgats(const std::string& path) {
       const char* text = cmsIT8GetDataRowCol(it8.get(), s, spectral[i]);
       const auto v = number(text);
       if (!v) {
-        bad_input(path + " set " + std::to_string(s + 1) + ", field " + names[spectral[i]] + ": " +
-                  (text == nullptr ? std::string("missing value")
-                                   : "not a number: \"" + std::string(text) + "\""));
+        bad_input(
+            path + " set " + std::to_string(s + 1) + ", field " + names[spectral[i]] + ": " +
+            (text == nullptr ? std::string("missing value") : "not a number: " + quote(text)));
       }
       row.values.push_back(*v);
     }
