@@ -3,8 +3,9 @@
 # that names the file and stays short, and a peak resident memory under
 # 256 MB (measured with /usr/bin/time). The inputs are made here: a JSON
 # document nested 100,000 deep, "kind" values of 100 MB and 500 KB, a CSV
-# file with one 200 MB line (100 million cells), a header of 100,000 cells, a
-# CGATS file past the size read whole, a 2 GiB sparse file named as a user
+# file with one 200 MB line (100 million cells), one 50 MB cell, a header of
+# 100,000 cells, a CGATS file past the size read whole and one of 15 million
+# sets just under it, a 2 GiB sparse file named as a user
 # stream, and a 60 MB CSV file read whole with too little memory to hold it
 # (the message must name the file).
 #
@@ -28,6 +29,11 @@ with open("many.csv", "w") as f:
     f.write("SAMPLE_NAME,360\n" + "a,1\n" * 15_000_000)
 with open("line.csv", "w") as f:
     f.write("SAMPLE_NAME,360\n" + "1," * 100_000_000 + "\n")
+with open("bytes.csv", "w") as f:
+    f.write("SAMPLE_NAME,360\n" + "9" * 50_000_000 + "\n")
+with open("sets.cgats", "w") as f:
+    f.write("CGATS.17\nNUMBER_OF_FIELDS 2\nBEGIN_DATA_FORMAT\nSAMPLE_NAME SPECTRAL_NM360\n")
+    f.write("END_DATA_FORMAT\nNUMBER_OF_SETS 15000000\nBEGIN_DATA\n" + "a 1\n" * 15_000_000 + "END_DATA\n")
 with open("cells.csv", "w") as f:
     f.write("SAMPLE_NAME," + ",".join(str(300 + i % 800) for i in range(100_000)) + "\n")
 with open("big.cgats", "w") as f:
@@ -56,9 +62,11 @@ case_ "nested 100,000 deep" "deep.json: v1User\[0\]\[0\].*nested deeper than 64"
 case_ "100 MB kind value" "kind.json: byte 1048587: a text longer than 1048576 bytes" "$kvdata" encode kind.json -o out.kvs
 case_ "500 KB kind value" "kind-500k.json: kind: \"k\{80\}\"... (500000 bytes) is not a kind" "$kvdata" encode kind-500k.json -o out.kvs
 case_ "one 200 MB line" "line.csv line 2: more than" "$kvdata" colour line.csv
+case_ "one 50 MB cell" "bytes.csv line 2: more than 1048576 bytes" "$kvdata" colour bytes.csv
 case_ "100,000 cells in a header" "cells.csv line 1: more than 2048 cells" "$kvdata" colour cells.csv
 case_ "same, read whole (spread)" "cells.csv line 1: more than 2048 cells" "$kvdata" spread cells.csv cells.csv
 case_ "CGATS past 64 MB" "big.cgats: is longer than" "$kvdata" colour big.cgats
+case_ "CGATS of 15 million sets" "sets.cgats: not a readable CGATS file" "$kvdata" colour sets.cgats
 case_ "2 GiB sparse user stream" "sparse.kvs: is 2147483648 bytes, longer than any stream" "$kvdata" explain user sparse.kvs
 case_ "out of memory names the file" "many.csv: reading the .*: out of memory" \
   bash -c "ulimit -v 100000 && exec \"$kvdata\" spread many.csv many.csv"
