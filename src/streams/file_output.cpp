@@ -100,14 +100,20 @@ bool FileOutput::open(const std::string& path) {
   failure_.clear();
   if (path.empty() || path.find('\0') != std::string::npos) return fail("not a file name", 0);
   struct stat st {};
+  // What the name finally refers to, as the system follows it (through
+  // links such as /dev/stdout to a pipe, which name no file): anything but
+  // a regular file is written in place under the name given.
+  if (::stat(path.c_str(), &st) == 0 && !S_ISREG(st.st_mode)) {
+    if (S_ISDIR(st.st_mode)) return fail("cannot write", EISDIR);
+    target_ = path;
+    owned_ = true;
+    fd_ = ::open(path.c_str(), O_WRONLY | O_CLOEXEC | O_NOCTTY);
+    return fd_ >= 0 || fail("cannot open", errno);
+  }
   bool exists = false;
   if (const int err = resolve(path, target_, st, exists)) return fail("cannot open", err);
   owned_ = true;
-  if (exists && S_ISDIR(st.st_mode)) return fail("cannot write", EISDIR);
-  if (exists && !S_ISREG(st.st_mode)) {
-    fd_ = ::open(target_.c_str(), O_WRONLY | O_CLOEXEC | O_NOCTTY);
-    return fd_ >= 0 || fail("cannot open", errno);
-  }
+  if (exists && !S_ISREG(st.st_mode)) return fail("cannot write", EEXIST);  // changed meanwhile
   fd_ = create_beside(folder_of(target_), temporary_);
   if (fd_ < 0) {
     temporary_.clear();

@@ -64,6 +64,8 @@ cases() {
     'encode - -o in.json <in.json' '[ $code = 2 ] && cmp -s in.json user.json'
   c "standard input named twice" '' \
     'spread - - <self.csv' '[ $code = 2 ]'
+  c "/dev/stdout into a pipe" '' \
+    'decode user user.kvs -o /dev/stdout | cat' '[ $code = 0 ] && cmp -s out "$examples/json/user.json"'
   c "directory refused" 'mkdir dir' \
     'decode user.kvs -o dir' '[ $code = 1 ] && [ -d dir ] && no_temporary'
   c "- reads standard input" '' \
