@@ -1,24 +1,19 @@
 // Stream files: a byte stream kept in a file as its raw bytes, no header.
-// Saving writes a temporary file beside the target and renames it over the
-// target, so the name always holds either the earlier file or the whole new
-// stream. Files are closed on every path by their owning handle.
+// Saving follows FileOutput's policy (a regular file is replaced whole, so
+// the name always holds either the earlier file or the whole new stream).
+// Files are closed on every path by their owning handle.
 
 #include <cerrno>
 #include <cstdio>
 #include <filesystem>
 #include <memory>
-#include <random>
+#include <span>
 #include <string>
 #include <system_error>
-#include <utility>
-
-#if __has_include(<unistd.h>)
-#include <unistd.h>
-#define KVDATA_HAVE_FSYNC 1
-#endif
 
 #include "automation/detail/failure.hpp"
 #include "kvdata/automation/text.hpp"
+#include "kvdata/streams/file_output.hpp"
 #include "kvdata/streams/streams.hpp"
 #include "streams/detail/little_endian.hpp"
 
@@ -37,49 +32,13 @@ std::string native_name(const String& filename) {
   return to_utf8(filename);
 }
 
-// Creates a new, exclusively owned file in the directory of `target` (so
-// that renaming it over the target stays within one file system) and opens
-// it for binary writing; its name is returned in `name`. The name is short,
-// so a target whose own name is near the length limit still gets one. Null
-// when none could be made.
-File create_beside(const std::string& target, std::string& name) {
-  const std::filesystem::path directory = std::filesystem::path(target).parent_path();
-  std::random_device entropy;
-  for (int attempt = 0; attempt < 16; ++attempt) {
-    const std::string leaf = ".kvdata~" + std::to_string(entropy()) + ".tmp";
-    name = (directory / leaf).string();
-    if (std::FILE* file = std::fopen(name.c_str(), "wbx")) return File(file);
-    if (errno != EEXIST) break;
-  }
-  name.clear();
-  return nullptr;
-}
-
-// Writes all of `bytes` to `file`, pushes them to the device and closes it.
-// True only when every step succeeded; the file is closed either way.
-bool write_and_close(File file, const ByteArray& bytes) {
-  const std::size_t n = bytes.size();
-  bool ok = n == 0 || std::fwrite(bytes.data(), 1, n, file.get()) == n;
-  ok = ok && std::fflush(file.get()) == 0;
-#ifdef KVDATA_HAVE_FSYNC
-  ok = ok && ::fsync(::fileno(file.get())) == 0;
-#endif
-  return std::fclose(file.release()) == 0 && ok;
-}
-
 bool save(const String& filename, const ByteArray& bytes) {
   if (bytes.rank() != 1) return false;
   const std::string target = native_name(filename);
   if (target.empty()) return false;
-  std::string temporary;
-  File file = create_beside(target, temporary);
-  if (!file) return false;
-  if (write_and_close(std::move(file), bytes) &&
-      std::rename(temporary.c_str(), target.c_str()) == 0) {
-    return true;
-  }
-  std::remove(temporary.c_str());
-  return false;
+  FileOutput out;
+  return out.open(target) && out.write(std::span<const Byte>(bytes.data(), bytes.size())) &&
+         out.commit();
 }
 
 bool load(const String& filename, ByteArray& bytes) {

@@ -13,7 +13,7 @@
 #include "spectra/cgats_writer.hpp"
 #include "spectra/csv_records.hpp"
 #include "support/errors.hpp"
-#include "support/output_file.hpp"
+#include "support/files.hpp"
 #include "support/spool.hpp"
 
 namespace kvdata::cli {
@@ -76,12 +76,15 @@ TEST(StreamingParts, CsvRecordsInPiecesAsWhole) {
     EXPECT_EQ(records_of(CsvRecords("t.csv", trickle(body, step), 4)), expected) << step;
   }
 
-  // A record longer than the reading buffer.
-  const std::string huge = "a,b\n\"" + std::string(3 << 20, 'z') + "\",1\nc,2\n";
-  const auto big = records_of(CsvRecords("t.csv", trickle(huge, 1 << 16)));
+  // A record longer than the reading buffer grows it, up to the limit.
+  const std::string huge =
+      "a,b\n\"" + std::string(CsvRecords::kMaxRecordBytes - 8, 'z') + "\",1\nc,2\n";
+  const auto big = records_of(CsvRecords("t.csv", trickle(huge, 1 << 16), 1 << 16));
   ASSERT_EQ(big.size(), 3u);
-  EXPECT_EQ(big[1].cells[0].size(), std::size_t{3} << 20);
+  EXPECT_EQ(big[1].cells[0].size(), CsvRecords::kMaxRecordBytes - 8);
   EXPECT_EQ(big[2], (Record{3, {"c", "2"}}));
+  const std::string past = "a,b\n" + std::string(CsvRecords::kMaxRecordBytes + 8, 'z') + "\n";
+  EXPECT_THROW(records_of(CsvRecords("t.csv", trickle(past, 1 << 16))), InputError);
 
   // An open quote names the line it starts on, however the text arrives.
   const std::string open = "a,b\n1,2\n3,\"4\n5\n";

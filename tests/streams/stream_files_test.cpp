@@ -1,4 +1,6 @@
 #include <gtest/gtest.h>
+#include <sys/stat.h>
+#include <sys/sysmacros.h>
 
 #include <filesystem>
 #include <fstream>
@@ -102,6 +104,23 @@ TEST_F(StreamFiles, AFailedSaveLeavesTheEarlierFileIntact) {
   EXPECT_FALSE(
       streams().StreamSave(name_of(path("nul")) + String(1, u'\0') + u"x", stream_of({1})));
   EXPECT_EQ(entries_in_dir(), 2u);
+}
+
+TEST_F(StreamFiles, SavingKeepsPermissionsFollowsLinksAndWritesDevicesInPlace) {
+  write_file(path("secret.bin"), Bytes(9, 1));
+  fs::permissions(path("secret.bin"), fs::perms::owner_read | fs::perms::owner_write);
+  fs::create_symlink("secret.bin", path("link.bin"));
+  ASSERT_TRUE(streams().StreamSave(name_of(path("link.bin")), stream_of({1, 2})));
+  EXPECT_TRUE(fs::is_symlink(path("link.bin")));
+  EXPECT_EQ(file_bytes(path("secret.bin")), (Bytes{1, 2}));
+  EXPECT_EQ(fs::status(path("secret.bin")).permissions(),
+            fs::perms::owner_read | fs::perms::owner_write);
+  // A device node of its own (when this process may make one) stays a device.
+  if (::mknod(path("null").c_str(), S_IFCHR | 0666, ::makedev(1, 3)) == 0) {
+    ASSERT_TRUE(streams().StreamSave(name_of(path("null")), stream_of({1, 2})));
+    EXPECT_TRUE(fs::is_character_file(path("null")));
+  }
+  EXPECT_EQ(entries_in_dir(), fs::exists(path("null")) ? 3u : 2u);  // no temporary file left
 }
 
 TEST_F(StreamFiles, LoadingNothingLeavesTheArrayAlone) {

@@ -4,11 +4,14 @@
 
 #include <exception>
 #include <iostream>
+#include <new>
+#include <string>
 #include <string_view>
 
 #include "commands/app.hpp"
 #include "kvdata/automation/error.hpp"
 #include "support/errors.hpp"
+#include "support/files.hpp"
 #include "support/library_log.hpp"
 #include "support/notes.hpp"
 
@@ -25,6 +28,7 @@ int failed(const kvdata::cli::RunLog& log, const char* message, int code) {
 
 int main(int argc, char** argv) {
   using namespace kvdata::cli;
+  install_signal_cleanup();
   // The library's event-log entries (field-codec failures) belong to this
   // run: they are kept for the end rather than sent to the system log.
   const RunLog log;
@@ -45,6 +49,10 @@ int main(int argc, char** argv) {
     return failed(log, e.what(), kExitBadInput);
   } catch (const kvdata::Error& e) {
     return failed(log, e.what(), kExitBadInput);
+  } catch (const std::bad_alloc&) {
+    const std::string what = Activity::current();
+    return failed(log, ((what.empty() ? "" : what + ": ") + "out of memory").c_str(),
+                  kExitBadInput);
   } catch (const std::exception& e) {
     return failed(log, e.what(), kExitBadInput);
   }

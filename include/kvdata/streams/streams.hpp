@@ -99,14 +99,18 @@ class Streams : public Object {
   bool Stream_User(const eStreamDirection& Direction, ByteArray& Stream, Long& Position,
                    tUser& User);
 
-  // Writes the stream's elements from lower to upper bound to the file,
-  // replacing it. The new content is written beside it and renamed over it,
-  // so a failure leaves any earlier file as it was. False on any failure
-  // (including an array without bounds); nothing is logged.
+  // Writes the stream's elements from lower to upper bound to the file by
+  // FileOutput's policy (file_output.hpp): a regular file is replaced whole
+  // (written beside it and renamed over it, keeping its permissions), so a
+  // failure leaves any earlier file as it was; a link is followed; a device
+  // or FIFO is written in place. False on any failure (including an array
+  // without bounds); nothing is logged.
   bool StreamSave(const String& Filename, const ByteArray& a);
 
   // Reads the whole file into an array with indices 1..length. A missing,
-  // empty or unreadable file gives False and leaves `a` unchanged.
+  // empty or unreadable file, or one longer than a stream can be (beyond the
+  // highest Long), gives False and leaves `a` unchanged; the length is
+  // checked before anything is read.
   bool StreamLoad(const String& Filename, ByteArray& a);
 
   // The 133-byte organisation block through StreamOrgTo / StreamOrgFrom;

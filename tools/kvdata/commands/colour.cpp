@@ -34,7 +34,7 @@
 #include "spectra/differences.hpp"
 #include "spectra/spectra_stream.hpp"
 #include "support/errors.hpp"
-#include "support/output_file.hpp"
+#include "support/files.hpp"
 #include "support/spool.hpp"
 #include "support/text_table.hpp"
 
@@ -662,6 +662,7 @@ struct Job {
 };
 
 void run_colour(const ColourOptions& o) {
+  refuse_output_among_inputs({o.output}, {o.file, o.against});
   SpectraStream in(o.file, o.extend);
   Job jobs[2];
   bool more = in.next(jobs[0].samples, kBlock);  // the file's own checks come first

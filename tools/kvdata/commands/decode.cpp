@@ -6,7 +6,6 @@
 #include "kvdata/automation/error.hpp"
 #include "support/errors.hpp"
 #include "support/files.hpp"
-#include "support/output_file.hpp"
 #include "wire/codec.hpp"
 #include "wire/identify.hpp"
 #include "wire/stream_walk.hpp"
@@ -92,9 +91,10 @@ std::size_t check_fit(StreamKind kind, const ByteArray& stream, const std::strin
 
 void run_decode(const DecodeOptions& o) {
   const auto [given, file] = kind_and_file(o.args);
+  refuse_output_among_inputs({o.output}, {file});
   ByteArray stream = read_byte_array(file);
   const std::span<const Byte> bytes = bytes_of(stream);
-  const StreamKind kind = resolve_kind(given, bytes, file, "decode");
+  const StreamKind kind = resolve_kind(given, stream, file, "decode");
   // An identified kind fits the whole stream.
   const std::size_t taken = given ? check_fit(kind, stream, file, o.force) : bytes.size();
   std::unique_ptr<StreamState> state;

@@ -1,6 +1,10 @@
 // kvdata encode [KIND] FILE.json -o OUT: the stream of a JSON document.
+#include <fstream>
+#include <string>
+
 #include "commands/commands.hpp"
 #include "commands/stream_args.hpp"
+#include "json/json_file.hpp"
 #include "support/errors.hpp"
 #include "support/files.hpp"
 #include "wire/codec.hpp"
@@ -13,28 +17,32 @@ struct EncodeOptions {
   std::string output;
 };
 
-// Its name ends in ".kvs" or it holds a zero byte.
-bool looks_like_stream(const std::string& file, const std::string& text) {
-  return file.ends_with(".kvs") || text.find('\0') != std::string::npos;
+// Its name ends in ".kvs", or its first bytes hold a zero byte.
+bool looks_like_stream(const std::string& file) {
+  if (file.ends_with(".kvs")) return true;
+  if (file == "-") return false;
+  std::ifstream in(file, std::ios::binary);
+  std::string head(4096, '\0');
+  in.read(head.data(), static_cast<std::streamsize>(head.size()));
+  head.resize(static_cast<std::size_t>(in.gcount()));
+  return head.find('\0') != std::string::npos;
 }
 
 void run_encode(const EncodeOptions& o) {
   const auto [given, file] = kind_and_file(o.args);
-  const std::string text = read_text(file);
+  refuse_output_among_inputs({o.output}, {file});
   Json doc;
   try {
-    doc = Json::parse(text);
-  } catch (const Json::exception& e) {
-    // Syntax errors, and also numbers beyond the range of a double ("1E400"),
-    // which the parser reports as out of range rather than as a parse error.
+    doc = read_json_file(file);
+  } catch (const InputError&) {
     // A stream given by mistake: the parser's words would show its bytes.
-    if (looks_like_stream(file, text)) {
+    if (looks_like_stream(file)) {
       bad_input(file +
                 ": not a JSON document; it looks like a stream. To see it as JSON: "
                 "kvdata decode " +
                 file);
     }
-    bad_input(file + ": not valid JSON: " + e.what());
+    throw;
   }
   std::vector<Byte> bytes;
   try {
@@ -42,7 +50,7 @@ void run_encode(const EncodeOptions& o) {
   } catch (const InputError& e) {
     bad_input(file + ": " + e.what());
   }
-  write_atomically(o.output, bytes);
+  write_output(o.output, bytes);
 }
 
 }  // namespace

@@ -5,7 +5,6 @@
 #include "commands/stream_args.hpp"
 #include "support/errors.hpp"
 #include "support/files.hpp"
-#include "support/output_file.hpp"
 #include "wire/explain_render.hpp"
 
 namespace kvdata::cli {
@@ -19,6 +18,7 @@ struct ExplainOptions {
 
 void run_explain(const ExplainOptions& o) {
   const auto [given, file] = kind_and_file(o.args);
+  refuse_output_among_inputs({o.output}, {file});
   const ByteArray bytes = read_byte_array(file);
   const StreamKind kind = resolve_kind(given, bytes, file, "explain");
   OutputFile out(o.output);

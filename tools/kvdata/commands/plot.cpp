@@ -203,8 +203,9 @@ class Plotter {
 
 void run_plot(const PlotOptions& o) {
   const auto [given, file] = kind_and_file(o.args);
+  refuse_output_among_inputs({o.output}, {file});
   ByteArray stream = read_byte_array(file);
-  const StreamKind kind = resolve_kind(given, bytes_of(stream), file, "plot");
+  const StreamKind kind = resolve_kind(given, stream, file, "plot");
   std::unique_ptr<StreamState> state;
   try {
     state = decode_stream(kind, stream);
@@ -221,7 +222,7 @@ void run_plot(const PlotOptions& o) {
     bad_usage("a " + std::string(kind_name(kind)) + " stream holds no spectra to plot");
   }
   plotter.warn_gaps(file);
-  write_atomically(o.output, chart.render());
+  write_output(o.output, chart.render());
 }
 
 }  // namespace

@@ -105,6 +105,7 @@ std::vector<Point> points(const std::array<Single, 40>& values) {
 }
 
 void run_spread(const SpreadOptions& o) {
+  refuse_output_among_inputs({o.output, o.svg}, {o.white, o.blue});
   const std::vector<tSpectrum> white = to_bands(read_spectra(o.white), o.extend);
   const std::vector<tSpectrum> blue = to_bands(read_spectra(o.blue), o.extend);
   for (const auto* tile : {&white, &blue}) {
@@ -215,7 +216,7 @@ void run_spread(const SpreadOptions& o) {
       chart.add_line(levels, name, {colours[t], ""}, points(rows[t].average));
       chart.add_line(spread, name, {colours[t], ""}, points(rows[t].std_dev));
     }
-    write_atomically(o.svg, chart.render());
+    write_output(o.svg, chart.render());
   }
   write_output(o.output, text);
 }

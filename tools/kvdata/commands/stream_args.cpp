@@ -20,7 +20,7 @@ void add_stream_args(CLI::App& cmd, StreamArgs& args, const std::string& file_wo
 
 StreamKind require_kind(const std::string& word) {
   if (auto kind = parse_kind(word)) return *kind;
-  bad_usage("unknown KIND \"" + word + "\"; KIND is one of: " + kind_list());
+  bad_usage("unknown KIND " + quote(word) + "; KIND is one of: " + kind_list());
 }
 
 KindAndFile kind_and_file(const StreamArgs& args) {
@@ -43,14 +43,6 @@ std::string json_hint(const std::string& file, std::span<const Byte> bytes) {
   if (!looks_json) return "";
   return "\n" + file + " looks like a JSON document; to make a stream of it: kvdata encode " +
          file + " -o STREAM.kvs";
-}
-
-StreamKind resolve_kind(std::optional<StreamKind> kind, std::span<const Byte> bytes,
-                        const std::string& file, const std::string& command) {
-  if (kind && !bytes.empty()) return *kind;
-  ByteArray a(0, static_cast<Long>(bytes.size()) - 1);
-  std::copy(bytes.begin(), bytes.end(), a.begin());
-  return resolve_kind(kind, a, file, command);
 }
 
 StreamKind resolve_kind(std::optional<StreamKind> kind, const ByteArray& bytes,

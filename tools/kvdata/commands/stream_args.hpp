@@ -47,8 +47,6 @@ StreamKind require_kind(const std::string& word);
 // UsageError asks for KIND; an empty file is an InputError either way.
 StreamKind resolve_kind(std::optional<StreamKind> kind, const ByteArray& bytes,
                         const std::string& file, const std::string& command);
-StreamKind resolve_kind(std::optional<StreamKind> kind, std::span<const Byte> bytes,
-                        const std::string& file, const std::string& command);
 
 // For messages about a stream that does not read: a line that points to
 // `kvdata encode` when the file looks like a JSON document (its name ends in

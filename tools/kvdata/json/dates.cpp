@@ -5,6 +5,7 @@
 #include <cstdint>
 #include <cstdio>
 
+#include "json/fields.hpp"
 #include "json/numbers.hpp"
 #include "support/errors.hpp"
 
@@ -157,7 +158,7 @@ Date date_from_json(const Json& j, std::string_view path) {
   }
   bad_input(std::string(path) +
             ": expected a date (\"YYYY-MM-DD\", \"YYYY-MM-DDThh:mm:ss[.mmm]\" " +
-            "or a number of days since 1899-12-30), found " + j.dump());
+            "or a number of days since 1899-12-30), found " + describe(j));
 }
 
 }  // namespace kvdata::cli

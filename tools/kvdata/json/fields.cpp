@@ -8,9 +8,38 @@
 
 namespace kvdata::cli {
 
+namespace {
+
+// Appends the start of `j`'s text to `out`, stopping soon after `out` holds
+// `room` characters: a value of any size or depth costs only what is shown.
+void brief(const Json& j, std::string& out, std::size_t room) {
+  if (j.is_string()) {
+    const auto& s = j.get_ref<const std::string&>();
+    out += Json(s.substr(0, room + 1)).dump();
+    return;
+  }
+  if (!j.is_structured()) {
+    out += j.dump();
+    return;
+  }
+  out += j.is_array() ? '[' : '{';
+  bool first = true;
+  for (auto it = j.begin(); it != j.end(); ++it) {
+    if (out.size() > room) return;
+    if (!first) out += ',';
+    first = false;
+    if (j.is_object()) out += Json(it.key().substr(0, room + 1)).dump() + ':';
+    brief(*it, out, room);
+  }
+  out += j.is_array() ? ']' : '}';
+}
+
+}  // namespace
+
 std::string describe(const Json& j) {
-  std::string text = j.dump();
-  if (text.size() > 40) text = text.substr(0, 37) + "...";
+  std::string text;
+  brief(j, text, kShownChars);
+  if (text.size() > kShownChars) text = text.substr(0, kShownChars - 3) + "...";
   return text;
 }
 
@@ -38,7 +67,7 @@ const Json& Fields::get(std::string_view name) {
 void Fields::done() const {
   for (const auto& [key, value] : j_.items()) {
     if (std::find(seen_.begin(), seen_.end(), key) == seen_.end()) {
-      bad_input(at(key) + ": unknown field");
+      bad_input(at(shortened(key)) + ": unknown field");
     }
   }
 }

@@ -127,12 +127,15 @@ void check_data_lines(const std::string& path, std::string_view text) {
 }  // namespace
 
 SpectraTable read_cgats(const std::string& path) {
+  return read_cgats(path, read_text(path));
+}
+
+SpectraTable read_cgats(const std::string& path, std::string_view text) {
   SpectraTable table;
   table.file = path;
   table.format = "CGATS";
   LcmsContext context;
   if (context.get() == nullptr) bad_input(path + ": cannot start Little CMS");
-  const std::string text = read_text(path);
   check_data_lines(path, text);
   if (text.size() > std::numeric_limits<cmsUInt32Number>::max()) {
     bad_input(path + ": too large for a CGATS file; CSV has no such limit");
@@ -191,9 +194,9 @@ SpectraTable read_cgats(const std::string& path) {
       const char* text = cmsIT8GetDataRowCol(it8.get(), s, spectral[i]);
       const auto v = number(text);
       if (!v) {
-        bad_input(path + " set " + std::to_string(s + 1) + ", field " + names[spectral[i]] + ": " +
-                  (text == nullptr ? std::string("missing value")
-                                   : "not a number: \"" + std::string(text) + "\""));
+        bad_input(
+            path + " set " + std::to_string(s + 1) + ", field " + names[spectral[i]] + ": " +
+            (text == nullptr ? std::string("missing value") : "not a number: " + quote(text)));
       }
       row.values.push_back(*v);
     }

@@ -7,6 +7,7 @@
 //   SpectraTable t = read_cgats("white.cgats");
 
 #include <string>
+#include <string_view>
 
 #include "spectra/spectra_table.hpp"
 
@@ -18,5 +19,7 @@ namespace kvdata::cli {
 // and with its line, for a file it cannot parse, and names the set and field
 // of a missing or non-numeric value.
 SpectraTable read_cgats(const std::string& path);
+// The same for a file's text already read; `path` names it in messages.
+SpectraTable read_cgats(const std::string& path, std::string_view text);
 
 }  // namespace kvdata::cli

@@ -191,7 +191,7 @@ bool CsvSpectraReader::next(std::span<double> values) {
     const std::string_view cell = cells[spectral_[i]];
     if (!number(cell, padded, values[i], denominators_[i])) {
       bad_input(path_ + " line " + std::to_string(records_.line()) + ", column " +
-                titles_[spectral_[i]] + ": not a number: \"" + std::string(trim(cell)) + "\"");
+                titles_[spectral_[i]] + ": not a number: " + quote(trim(cell)));
     }
   }
   // The divisions of the row one after another, free of the parsing's branches.

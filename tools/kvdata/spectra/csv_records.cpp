@@ -49,6 +49,8 @@ std::string_view CsvRecords::peek(std::size_t n) const {
 // buffer grown when a record fills it); false when the source has ended.
 bool CsvRecords::more() {
   if (at_end_) return false;
+  // Only an unfinished record asks for more: [begin_, end_) is its start.
+  if (end_ - begin_ > kMaxRecordBytes) too_large("bytes", kMaxRecordBytes);
   if (begin_ > 0) {
     std::memmove(buffer_.data(), buffer_.data() + begin_, end_ - begin_);
     end_ -= begin_;
@@ -66,7 +68,13 @@ bool CsvRecords::more() {
   return true;
 }
 
+void CsvRecords::too_large(const char* what, std::size_t limit) const {
+  bad_input(path_ + " line " + std::to_string(line_) + ": more than " + std::to_string(limit) +
+            " " + what + " in one record; no measurement file holds such a line");
+}
+
 void CsvRecords::finish(std::size_t next_begin, std::size_t next_line) {
+  if (next_begin - begin_ > kMaxRecordBytes + 2) too_large("bytes", kMaxRecordBytes);
   record_line_ = line_;
   begin_ = next_begin;
   line_ = next_line;
@@ -93,6 +101,7 @@ CsvRecords::Step CsvRecords::parse_plain() {
       return Step::Record;
     }
     cells_.emplace_back(cell, static_cast<std::size_t>(p - cell));
+    if (cells_.size() > kMaxCells) too_large("cells", kMaxCells);
     if (*p == sep) {
       ++p;
       continue;
@@ -125,6 +134,9 @@ CsvRecords::Step CsvRecords::parse_quoted() {
     return Step::Record;
   };
   for (const char* p = base + begin_; p < e; ++p) {
+    if (static_cast<std::size_t>(p - base) - begin_ > kMaxRecordBytes) {
+      too_large("bytes", kMaxRecordBytes);
+    }
     const char c = *p;
     if (quoted) {
       if (c == '"' && p + 1 == e && !at_end_) return Step::NeedMore;
@@ -142,6 +154,7 @@ CsvRecords::Step CsvRecords::parse_quoted() {
     } else if (c == sep) {
       owned_.push_back(std::move(cell));
       cell.clear();
+      if (owned_.size() > kMaxCells) too_large("cells", kMaxCells);
     } else if (c == '\n' || c == '\r') {
       if (c == '\r' && p + 1 == e && !at_end_) return Step::NeedMore;
       if (c == '\r' && p + 1 < e && p[1] == '\n') ++p;

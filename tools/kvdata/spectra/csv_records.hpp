@@ -44,6 +44,10 @@ class CsvRecords {
   // are whatever follows in the block, or unspecified).
   bool cells_in_block() const { return in_block_; }
   static constexpr std::size_t kReadAhead = 8;
+  // A record longer than this or with more cells is refused, naming its
+  // line, rather than held: no measurement file comes near either.
+  static constexpr std::size_t kMaxRecordBytes = std::size_t{1} << 20;
+  static constexpr std::size_t kMaxCells = 2048;
   // The line on which the current record starts (1-based).
   std::size_t line() const { return record_line_; }
   // Bytes taken from the source so far.
@@ -58,6 +62,7 @@ class CsvRecords {
   Step parse_quoted();
   bool more();
   void finish(std::size_t next_begin, std::size_t next_line);
+  [[noreturn]] void too_large(const char* what, std::size_t limit) const;
 
   std::string path_;
   Source source_;

@@ -19,12 +19,20 @@ constexpr std::size_t kSniffBytes = std::size_t{1} << 20;
 }  // namespace
 
 SpectraStream::SpectraStream(const std::string& path, bool extend) : path_(path), extend_(extend) {
+  const Activity reading(path + ": reading the spectra");
   input_ = std::make_unique<InputFile>(path);
   InputFile* file = input_.get();
   CsvRecords records(path, [file](char* to, std::size_t room) { return file->read(to, room); });
   if (records.peek(kSniffBytes).find("BEGIN_DATA_FORMAT") != std::string_view::npos) {
+    // Read whole from here on (standard input cannot be opened again).
+    std::string text(records.peek(kMaxWholeTextBytes));
+    char buf[1 << 16];
+    while (const std::size_t n = input_->read(buf, sizeof buf)) {
+      if (n > kMaxWholeTextBytes - text.size()) text_too_long(path, kMaxWholeTextBytes);
+      text.append(buf, n);
+    }
     input_.reset();
-    table_ = std::make_unique<SpectraTable>(read_spectra(path));
+    table_ = std::make_unique<SpectraTable>(read_spectra(path, text));
     return;
   }
   csv_ = std::make_unique<CsvSpectraReader>(path, std::move(records));
@@ -49,6 +57,7 @@ bool SpectraStream::named() const {
 }
 
 bool SpectraStream::next(SpectraBlock& block, std::size_t max) {
+  const Activity reading(path_ + ": reading the spectra");
   if (table_ && !started_) {
     started_ = true;
     columns_ = band_columns(path_, table_->wavelengths, extend_);

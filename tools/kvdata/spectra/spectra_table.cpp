@@ -113,9 +113,13 @@ void order_columns(SpectraTable& table) {
 }
 
 SpectraTable read_spectra(const std::string& path) {
-  const std::string text = read_text(path);
-  SpectraTable table =
-      text.find("BEGIN_DATA_FORMAT") != std::string::npos ? read_cgats(path) : read_csv(path, text);
+  return read_spectra(path, read_text(path));
+}
+
+SpectraTable read_spectra(const std::string& path, const std::string& text) {
+  const Activity reading(path + ": reading the spectra");
+  SpectraTable table = text.find("BEGIN_DATA_FORMAT") != std::string::npos ? read_cgats(path, text)
+                                                                           : read_csv(path, text);
   order_columns(table);
   for (const SpectrumRow& row : table.rows) check_sample_name(row.name, table.where(row));
   if (table.rows.empty()) bad_input(path + ": holds no spectra (no data rows)");

@@ -35,6 +35,8 @@ struct SpectraTable {
 // Reads a CSV or CGATS file (CGATS when it has a BEGIN_DATA_FORMAT section).
 // InputError names the file and the line, set or field that is wrong.
 SpectraTable read_spectra(const std::string& path);
+// The same for a file's text already read; `path` names it in messages.
+SpectraTable read_spectra(const std::string& path, const std::string& text);
 
 // The wavelength in a column or field name such as "360", "nm360", "R360",
 // "360nm", "SPECTRAL_NM360" or "SPECTRAL_360"; negative when the name holds

@@ -1,32 +1,55 @@
 #pragma once
-// Whole-file input and all-or-nothing output. Output goes to a temporary file
-// beside the target, which is renamed over the target only once everything
-// was written, so a failed command never leaves a half-written or emptied
-// output file behind.
+// The command's inputs and outputs. "-" names standard input as an input and
+// standard output as an output, for every subcommand. Every output file is
+// written by the library's FileOutput policy (kvdata/streams/file_output.hpp):
+// a regular file is replaced only once the whole result was written, keeping
+// its permissions; a link is followed; a device or FIFO is written in place.
+// A signal (SIGINT, SIGTERM, SIGHUP) removes the temporary file before the
+// command exits with 128 + the signal's number.
 //
-//   std::vector<kvdata::Byte> bytes = read_bytes("tileset.kvs");
-//   write_output("out.json", text);   // "-" or empty: standard output
+//   refuse_output_among_inputs(o.output, {file});   // before anything is read
+//   ByteArray bytes = read_byte_array(file);
+//   write_output(o.output, text);                   // "-" or empty: standard output
 
+#include <initializer_list>
 #include <span>
 #include <string>
 #include <string_view>
-#include <vector>
 
 #include "kvdata/automation/array.hpp"
 #include "kvdata/automation/types.hpp"
+#include "kvdata/streams/file_output.hpp"
 
 namespace kvdata::cli {
 
-// The file's bytes. A missing or unreadable file raises InputError naming it.
-std::vector<Byte> read_bytes(const std::string& path);
-// The file's bytes as a stream with indices 0..n-1, read straight into the
-// array. Same failures as read_bytes.
-ByteArray read_byte_array(const std::string& path);
-// The file's text, as bytes. Same failures as read_bytes.
-std::string read_text(const std::string& path);
+// Removes the output's temporary file on SIGINT, SIGTERM and SIGHUP before
+// the command exits with 128 + the signal's number. Installed once by main().
+void install_signal_cleanup();
 
-// A file opened for reading piece by piece, closed with the object. The
-// same failures as read_bytes, from the constructor and from read().
+// UsageError when an output is the same file (device and inode, links
+// followed) as one of the inputs, or when standard input is named twice.
+// Called before anything is read, so no input is lost to its own output.
+void refuse_output_among_inputs(std::initializer_list<std::string> outputs,
+                                std::initializer_list<std::string> inputs);
+
+// The file's bytes as a stream with indices 0..n-1, read straight into the
+// array. InputError naming the file when it is missing, unreadable, a
+// directory, or longer than any stream can be (beyond the highest Long; a
+// regular file is refused from its size before anything is read).
+ByteArray read_byte_array(const std::string& path);
+// The most of a text file that is read whole (a CGATS file, which Little
+// CMS parses in memory): about 100,000 spectra.
+inline constexpr std::size_t kMaxWholeTextBytes = std::size_t{64} << 20;
+
+// The file's text. Same failures, and InputError when it is longer than
+// `max_bytes` (refused from a regular file's size before it is read).
+std::string read_text(const std::string& path, std::size_t max_bytes = kMaxWholeTextBytes);
+// The InputError of a text longer than `max_bytes`.
+[[noreturn]] void text_too_long(const std::string& path, std::size_t max_bytes);
+
+// A file opened for reading piece by piece, closed with the object ("-":
+// standard input, left open). The same failures as read_byte_array, from the
+// constructor and from read().
 class InputFile {
  public:
   explicit InputFile(const std::string& path);
@@ -44,13 +67,37 @@ class InputFile {
   std::size_t size_ = 0;
 };
 
-// Replaces `path` with `content` atomically (temporary file, then rename).
-// On failure the temporary file is removed, `path` is untouched and
-// InputError names the file and the reason.
-void write_atomically(const std::string& path, std::span<const Byte> content);
-void write_atomically(const std::string& path, std::string_view content);
+// Output written piece by piece ("" or "-": standard output). Bytes written
+// to standard output stay written; a file is finished only by commit(), and
+// an output dropped without it leaves its target as it was. InputError
+// naming the target and the reason from every member.
+class OutputFile {
+ public:
+  explicit OutputFile(const std::string& path);
+  ~OutputFile();
+  OutputFile(const OutputFile&) = delete;
+  OutputFile& operator=(const OutputFile&) = delete;
+  void write(std::string_view text);
+  void commit();
 
-// `path` empty or "-": standard output; otherwise write_atomically.
+ private:
+  [[noreturn]] void fail();
+
+  // Forgets the temporary file for the signal handler, after out_ is gone.
+  struct Registration {
+    Registration() = default;
+    ~Registration();
+    Registration(const Registration&) = delete;
+    Registration& operator=(const Registration&) = delete;
+  };
+
+  std::string name_;  // for messages
+  Registration registration_;
+  FileOutput out_;
+};
+
+// The whole of `content` to `path` ("" or "-": standard output).
 void write_output(const std::string& path, std::string_view content);
+void write_output(const std::string& path, std::span<const Byte> content);
 
 }  // namespace kvdata::cli

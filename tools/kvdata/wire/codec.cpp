@@ -485,9 +485,9 @@ StreamKind document_kind(const Json& doc, std::optional<StreamKind> kind) {
   const std::string& word = it->get_ref<const std::string&>();
   const auto named = parse_kind(word);
   if (!named)
-    bad_input("kind: \"" + word + "\" is not a kind of stream; expected one of: " + kind_list());
+    bad_input("kind: " + quote(word) + " is not a kind of stream; expected one of: " + kind_list());
   if (kind && *named != *kind) {
-    bad_input("kind: the document holds a \"" + word + "\" stream, not \"" +
+    bad_input("kind: the document holds a " + quote(word) + " stream, not \"" +
               std::string(kind_name(*kind)) + "\"");
   }
   return *named;

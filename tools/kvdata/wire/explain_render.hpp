@@ -16,7 +16,7 @@
 
 #include "kvdata/automation/array.hpp"
 #include "kvdata/streams/stream_observer.hpp"
-#include "support/output_file.hpp"
+#include "support/files.hpp"
 #include "wire/stream_walk.hpp"
 
 namespace kvdata::cli {
