@@ -383,7 +383,8 @@ host_wall_ratio="$(jq -r 'map(.real_time / .cpu_time) | add / length' "$work/med
     echo "A million spectra of percent reflectance (random walks as above) each way; the two run in"
     echo "turns, $repetitions times, and each figure is the median. The C++ entry point writes into"
     echo "output it reuses; the Python function takes a C-contiguous float32 NumPy array (no copy)"
-    echo "and makes its two N x 3 outputs on every call. Millions of spectra per CPU second, one core."
+    echo "and fills the two N x 3 outputs it is given (\`xyz=\`, \`lab=\`), the same on every call."
+    echo "Millions of spectra per CPU second, one core."
     echo
     echo "| | M spectra/s |"
     echo "|---|---|"

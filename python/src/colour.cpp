@@ -22,17 +22,33 @@ Array<Single> array_of(const std::vector<Single>& v) {
   return a;
 }
 
-py::tuple batch(const Spectra& spectra) {
+using Results = py::array_t<Single, py::array::c_style>;
+
+// `given` when it is a writable C-contiguous float32 N x 3 array, or a new one.
+Results results_for(const py::object& given, py::ssize_t n, const char* name) {
+  if (given.is_none()) return Results({n, py::ssize_t{3}});
+  const bool fits =
+      py::isinstance<Results>(given) && (given.cast<py::array>().flags() & py::array::c_style) != 0;
+  Results out = fits ? given.cast<Results>() : Results();
+  if (!fits || out.ndim() != 2 || out.shape(0) != n || out.shape(1) != 3 || !out.writeable()) {
+    throw py::value_error(std::string(name) +
+                          ": expected a writable C-contiguous float32 array of N x 3");
+  }
+  return out;
+}
+
+py::tuple batch(const Spectra& spectra, const py::object& xyz_given, const py::object& lab_given) {
   if (spectra.ndim() != 2 || spectra.shape(1) != kBandCount) {
     throw py::value_error("expected an N x 40 array of spectra");
   }
   const auto n = static_cast<std::size_t>(spectra.shape(0));
-  py::array_t<Single> xyz({spectra.shape(0), py::ssize_t{3}});
-  py::array_t<Single> lab({spectra.shape(0), py::ssize_t{3}});
+  Results xyz = results_for(xyz_given, spectra.shape(0), "xyz");
+  Results lab = results_for(lab_given, spectra.shape(0), "lab");
   const std::span<const Single> in(spectra.data(), n * kBandCount);
   const std::span<Single> xyz_out(xyz.mutable_data(), 3 * n);
   const std::span<Single> lab_out(lab.mutable_data(), 3 * n);
   {
+    // Overlapping arrays raise error 5 before anything is written.
     py::gil_scoped_release unlocked;
     (void)calc_xyz_lab_d6510(in, xyz_out, lab_out);
   }
@@ -97,13 +113,16 @@ arrays (index 0 first).)")
           },
           py::arg("LABStandard"), py::arg("LABTrial"), "(dL, da, db), dE of two CIELAB values.");
 
-  m.def("calc_xyz_lab_d6510", &batch, py::arg("spectra"), R"(
+  m.def("calc_xyz_lab_d6510", &batch, py::arg("spectra"), py::kw_only(),
+        py::arg("xyz") = py::none(), py::arg("lab") = py::none(), R"(
 XYZ and CIELAB of many spectra at once: spectra is an N x 40 array of
 percent reflectance (float32, C-contiguous: used without a copy; anything
 else is converted first). Returns (xyz, lab), two N x 3 float32 arrays,
 bit for bit what ILU_D6510.calcXYZ followed by calcLAB gives; a spectrum
 whose conversion overflows a Single or meets a NaN gets NaN in its six
-results. The GIL is released during the work.)");
+results. The GIL is released during the work. xyz= and lab= take two
+N x 3 float32 C-contiguous arrays to fill instead of new ones (for repeated
+calls on blocks of one size).)");
 }
 
 }  // namespace kvdata::python

@@ -161,6 +161,17 @@ def test_batch_matches_ilu_d6510_bit_for_bit():
     assert np.array_equal(again, xyz, equal_nan=True)
     with pytest.raises(ValueError):
         kvdata.calc_xyz_lab_d6510(spectra[:, :39])
+    # Given outputs are filled in place; outputs that cannot take the results are refused.
+    out_xyz, out_lab = np.zeros((2000, 3), np.float32), np.zeros((2000, 3), np.float32)
+    got = kvdata.calc_xyz_lab_d6510(spectra, xyz=out_xyz, lab=out_lab)
+    assert got[0] is out_xyz and got[1] is out_lab
+    assert np.array_equal(out_xyz, xyz, equal_nan=True) and np.array_equal(out_lab, lab, equal_nan=True)
+    for bad in (np.zeros((1999, 3), np.float32), np.zeros((2000, 3)), np.zeros((3, 2000), np.float32).T):
+        with pytest.raises(ValueError):
+            kvdata.calc_xyz_lab_d6510(spectra, xyz=bad)
+    with pytest.raises(kvdata.Error) as caught:
+        kvdata.calc_xyz_lab_d6510(spectra, xyz=out_xyz, lab=out_xyz)
+    assert caught.value.number == 5
 
 
 def test_errors_map_to_exception_types():
