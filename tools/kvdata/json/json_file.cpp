@@ -152,9 +152,10 @@ class Nesting {
     std::string p;
     for (const Frame& f : frames_) {
       if (f.array) {
-        p += "[" + std::to_string(f.index) + "]";
+        p.append("[").append(std::to_string(f.index)).append("]");
       } else {
-        p += (p.empty() ? "" : ".") + shortened(f.key);
+        if (!p.empty()) p.append(".");
+        p.append(shortened(f.key));
       }
     }
     return p.empty() ? "the document" : shortened(p);
