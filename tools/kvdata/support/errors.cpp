@@ -26,14 +26,16 @@ std::string shortened(std::string_view value) {
   if (value.size() <= kShownChars) return std::string(value);
   std::size_t cut = kShownChars;
   while (cut > 0 && (static_cast<unsigned char>(value[cut]) & 0xC0) == 0x80) --cut;
-  return std::string(value.substr(0, cut)) + "... (" + std::to_string(value.size()) + " bytes)";
+  std::string s(value.substr(0, cut));
+  return s.append("... (").append(std::to_string(value.size())).append(" bytes)");
 }
 
 std::string quote(std::string_view value) {
-  if (value.size() <= kShownChars) return "\"" + std::string(value) + "\"";
+  std::string q("\"");
+  if (value.size() <= kShownChars) return q.append(value).append("\"");
   const std::string cut = shortened(value);
   const std::size_t dots = cut.rfind("... (");
-  return "\"" + cut.substr(0, dots) + "\"" + cut.substr(dots);
+  return q.append(cut, 0, dots).append("\"").append(cut, dots);
 }
 
 Activity::Activity(std::string what)
