@@ -136,6 +136,8 @@ SpectraTable read_cgats(const std::string& path, std::string_view text) {
   table.format = "CGATS";
   LcmsContext context;
   if (context.get() == nullptr) bad_input(path + ": cannot start Little CMS");
+  // Little CMS takes an empty text for a broken call and aborts.
+  if (text.empty()) bad_input(path + ": is empty; there is no CGATS table to read");
   check_data_lines(path, text);
   if (text.size() > std::numeric_limits<cmsUInt32Number>::max()) {
     bad_input(path + ": too large for a CGATS file; CSV has no such limit");
