@@ -5,14 +5,16 @@
 # document nested 100,000 deep, "kind" values of 100 MB and 500 KB, a CSV
 # file with one 200 MB line (100 million cells), one 50 MB cell, a header of
 # 100,000 cells, a CGATS file past the size read whole and one of 15 million
-# sets just under it, a 2 GiB sparse file named as a user
-# stream, and a 60 MB CSV file read whole with too little memory to hold it
+# sets just under it, a 2 GiB sparse file named as a user stream, a user
+# stream followed by 2 GB of zeros (read no further than the user's own
+# bytes), and a 60 MB CSV file read whole with too little memory to hold it
 # (the message must name the file).
 #
 #   scripts/hostile-input.sh [KVDATA]     # default build/dev/bin/kvdata; exit 1 on a breach
 set -euo pipefail
 cd "$(dirname "$0")/.."
 kvdata=$(realpath "${1:-build/dev/bin/kvdata}")
+examples=$PWD/examples
 limit_kb=$((256 * 1024))
 work=$(mktemp -d)
 trap 'rm -rf "$work"' EXIT
@@ -41,6 +43,8 @@ with open("big.cgats", "w") as f:
     f.write("BEGIN_DATA\n" + "a 1\n" * 20_000_000 + "END_DATA\n")
 EOF
 truncate -s 2G sparse.kvs
+cp "$examples/streams/user.kvs" user-2g.kvs
+truncate -s 2000M user-2g.kvs
 
 status=0
 # case NAME EXPECTED-MESSAGE-PART COMMAND...
@@ -68,6 +72,10 @@ case_ "same, read whole (spread)" "cells.csv line 1: more than 2048 cells" "$kvd
 case_ "CGATS past 64 MB" "big.cgats: is longer than" "$kvdata" colour big.cgats
 case_ "CGATS of 15 million sets" "sets.cgats line 6: NUMBER_OF_SETS is 15000000; .* at most 32766 sets" "$kvdata" colour sets.cgats
 case_ "2 GiB sparse user stream" "sparse.kvs: is 2147483648 bytes, longer than any stream" "$kvdata" explain user sparse.kvs
+case_ "user stream + 2 GB (explain)" "user-2g.kvs: Stops at offset 849, .*2097151151 more bytes follow" \
+  "$kvdata" explain user user-2g.kvs
+case_ "user stream + 2 GB (decode)" "not a user stream as a whole (2097152000 bytes)" \
+  "$kvdata" decode user user-2g.kvs
 case_ "out of memory names the file" "many.csv: reading the .*: out of memory" \
   bash -c "ulimit -v 100000 && exec \"$kvdata\" spread many.csv many.csv"
 exit $status

@@ -12,6 +12,7 @@
 #include "kvdata/foundation/record_fields.hpp"
 #include "kvdata/objects/kv_cal_tile.hpp"
 #include "kvdata/streams/stream_observer.hpp"
+#include "kvdata/streams/streams.hpp"
 #include "objects/detail/object_stream.hpp"
 #include "objects/detail/property_names.hpp"
 #include "objects/detail/record_image.hpp"
@@ -47,7 +48,7 @@ constexpr const detail::Cell& kTempCalibrated =
     kHeader.at(field_name<&tTileSetCalibration::TempCalibrated>());
 constexpr Integer kTileCount = 13;
 constexpr std::size_t kBlockBytes = kHeader.bytes + kTileCount * kSlot.bytes;
-static_assert(kSlot.bytes == 320 && kBlockBytes == 4188);
+static_assert(kSlot.bytes == Streams::kSCPairBytes && kBlockBytes == KVCalibration::kStreamBytes);
 
 constexpr std::string_view kProperty = detail::property_name<KVCalibration>("v1Calibration");
 constexpr std::string_view kTiles = field_name<&tTileSetCalibration::Tiles>();

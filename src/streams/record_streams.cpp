@@ -43,6 +43,7 @@ static_assert(kTableBytes == 1280);
 // count), ColorRGB, TempComp, and its certified pair of spectra.
 constexpr std::size_t kMinTileSetTileBytes = 4 + 4 + 40 * 4 + 80 * 4;
 static_assert(kMinTileSetTileBytes == 488);
+static_assert(2 * kSpectrumBytes == Streams::kSCPairBytes);
 // Certified and TempCalibrated, between the tiles and the certified spectra.
 constexpr std::size_t kCalibrationHeaderBytes = 8 + 4;
 

@@ -9,6 +9,7 @@
 //   cal->Tiles(13)->SCWL(kvdata::eSC::SCI, 40, 87.5);   // block offset 4184
 
 #include <array>
+#include <cstddef>
 #include <memory>
 
 #include "kvdata/automation/array.hpp"
@@ -30,6 +31,9 @@ class KVCalibration : public InertDBObject,
                       public IKVStream,
                       public InertSecurity {
  public:
+  // The block StreamIn reads and StreamOut writes.
+  static constexpr std::size_t kStreamBytes = 4188;
+
   // All zero: TSN of 8 U+0000 units, date 0, temperature 0, all spectra 0.
   static std::shared_ptr<KVCalibration> create();
 

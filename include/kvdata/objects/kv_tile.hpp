@@ -8,6 +8,7 @@
 //   tile->ColorName(u"Red");  tile->StreamOut(bytes);   // 264 bytes at index 0
 
 #include <array>
+#include <cstddef>
 #include <memory>
 
 #include "kvdata/automation/array.hpp"
@@ -23,6 +24,9 @@ class KVTileSet;
 
 class KVTile : public IKVTile, public IKVStream {
  public:
+  // The tile block StreamIn reads and StreamOut writes.
+  static constexpr std::size_t kStreamBytes = 264;
+
   // A free-standing tile: all zero (50 U+0000 name units), Order 0, no parent.
   static std::shared_ptr<KVTile> create();
 

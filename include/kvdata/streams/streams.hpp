@@ -22,6 +22,7 @@
 //   outside it, stream too short) logs its one event-log entry and the
 //   operation stops there and returns False.
 
+#include <cstddef>
 #include <memory>
 
 #include "kvdata/automation/array.hpp"
@@ -34,6 +35,13 @@ namespace kvdata {
 
 class Streams : public Object {
  public:
+  // The streams whose size never varies: an SC pair, a user block and an
+  // organisation block. A reader takes exactly these bytes, so a program
+  // holding a longer file need read no more of it.
+  static constexpr std::size_t kSCPairBytes = 320;
+  static constexpr std::size_t kUserBlockBytes = 261;
+  static constexpr std::size_t kOrganizationBlockBytes = 133;
+
   static std::shared_ptr<Streams> create();
   // The predeclared instance, usable without creating one.
   static Streams& instance();

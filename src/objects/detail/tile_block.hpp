@@ -17,6 +17,7 @@
 #include "kvdata/automation/types.hpp"
 #include "kvdata/foundation/record_fields.hpp"
 #include "kvdata/foundation/records.hpp"
+#include "kvdata/objects/kv_tile.hpp"
 #include "streams/detail/block_layout.hpp"
 
 namespace kvdata::detail {
@@ -30,7 +31,7 @@ inline constexpr const Cell& kTileName = kTileLayout.at(field_name<&tTileDef::Na
 inline constexpr const Cell& kTileColorRGB = kTileLayout.at(field_name<&tTileDef::ColorRGB>());
 inline constexpr const Cell& kTileTempComp = kTileLayout.at(field_name<&tTileDef::TempComp>());
 inline constexpr std::size_t kTileBlockBytes = kTileLayout.bytes;
-static_assert(kTileBlockBytes == 264);
+static_assert(kTileBlockBytes == KVTile::kStreamBytes);
 
 using TileBlock = std::array<Byte, kTileBlockBytes>;
 

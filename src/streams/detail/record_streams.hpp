@@ -13,12 +13,13 @@
 #include "kvdata/automation/array.hpp"
 #include "kvdata/automation/types.hpp"
 #include "kvdata/foundation/records.hpp"
+#include "kvdata/streams/streams.hpp"
 
 namespace kvdata::detail {
 
 // Sizes of the two fixed-size record blocks.
-inline constexpr std::size_t kUserStreamBlockBytes = 261;
-inline constexpr std::size_t kOrganizationBlockBytes = 133;
+inline constexpr std::size_t kUserStreamBlockBytes = Streams::kUserBlockBytes;
+inline constexpr std::size_t kOrganizationBlockBytes = Streams::kOrganizationBlockBytes;
 
 // The argument names of the Stream_ operations. Each reader enters the
 // record it reads under the name of its argument, as a caller sees it.

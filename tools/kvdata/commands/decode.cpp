@@ -1,5 +1,7 @@
 // kvdata decode [KIND] FILE: the stream as JSON.
+#include <filesystem>
 #include <iostream>
+#include <optional>
 
 #include "commands/commands.hpp"
 #include "commands/stream_args.hpp"
@@ -57,16 +59,28 @@ void check_round_trip(StreamState& state, std::span<const Byte> bytes, const std
   warn(file, "encoding this JSON will not give back the same bytes: " + what);
 }
 
+// The whole file, to name the kind it is: held already, or read again
+// when only a fixed-size kind's bytes were read from a regular file of
+// ordinary size. None for standard input, a pipe or a huge file.
+std::optional<ByteArray> whole_file(const StreamInput& in, const std::string& file) {
+  if (in.whole()) return in.bytes;
+  std::error_code ignored;
+  if (file == "-" || in.size > kMaxWholeTextBytes ||
+      !std::filesystem::is_regular_file(file, ignored)) {
+    return std::nullopt;
+  }
+  return read_byte_array(file);
+}
+
 // With KIND named, a stream that the kind does not fit whole (its reader
 // refuses it, or bytes are left over) is refused, unless --force asks for
 // what the reader takes. Returns how many bytes the JSON will hold.
-std::size_t check_fit(StreamKind kind, const ByteArray& stream, const std::string& file,
-                      bool force) {
-  const std::span<const Byte> bytes = bytes_of(stream);
-  const WalkEnd end = walk_stream(kind, stream);
+std::size_t check_fit(StreamKind kind, const StreamInput& in, const std::string& file, bool force) {
+  const std::span<const Byte> bytes = bytes_of(in.bytes);
+  const WalkEnd end = walk_stream(kind, in.bytes, in.size);
   if (!end.problem) return bytes.size();
   const std::string name(kind_name(kind));
-  const std::string stop = verdict(kind, end, bytes.size());
+  const std::string stop = verdict(kind, end, in.size);
   if (force) {
     warn(file, "decoded as a " + name + " stream although it is not one as a whole. " + stop +
                    " The JSON holds the first " + std::to_string(end.problem->offset) +
@@ -74,11 +88,13 @@ std::size_t check_fit(StreamKind kind, const ByteArray& stream, const std::strin
     return end.problem->offset;
   }
   std::string message = file + ": not a " + name + " stream as a whole (" +
-                        std::to_string(bytes.size()) + " bytes). " + stop;
-  const Identification id = identify(stream);
-  if (id.kind && *id.kind != kind) {
-    message += "\nIt reads whole as a " + std::string(kind_name(*id.kind)) +
-               " stream: kvdata decode " + std::string(kind_name(*id.kind)) + " " + file;
+                        std::to_string(in.size) + " bytes). " + stop;
+  if (const std::optional<ByteArray> all = whole_file(in, file)) {
+    const Identification id = identify(*all);
+    if (id.kind && *id.kind != kind) {
+      message += "\nIt reads whole as a " + std::string(kind_name(*id.kind)) +
+                 " stream: kvdata decode " + std::string(kind_name(*id.kind)) + " " + file;
+    }
   }
   message += "\nkvdata explain " + name + " " + file + " shows the stream field by field";
   // Bytes left over: the reader took the stream up to there.
@@ -92,11 +108,12 @@ std::size_t check_fit(StreamKind kind, const ByteArray& stream, const std::strin
 void run_decode(const DecodeOptions& o) {
   const auto [given, file] = kind_and_file(o.args);
   refuse_output_among_inputs({o.output}, {file});
-  ByteArray stream = read_byte_array(file);
+  StreamInput in = read_stream_input(given, file);
+  ByteArray& stream = in.bytes;
   const std::span<const Byte> bytes = bytes_of(stream);
   const StreamKind kind = resolve_kind(given, stream, file, "decode");
   // An identified kind fits the whole stream.
-  const std::size_t taken = given ? check_fit(kind, stream, file, o.force) : bytes.size();
+  const std::size_t taken = given ? check_fit(kind, in, file, o.force) : bytes.size();
   std::unique_ptr<StreamState> state;
   try {
     state = decode_stream(kind, stream);

@@ -19,12 +19,13 @@ struct ExplainOptions {
 void run_explain(const ExplainOptions& o) {
   const auto [given, file] = kind_and_file(o.args);
   refuse_output_among_inputs({o.output}, {file});
-  const ByteArray bytes = read_byte_array(file);
-  const StreamKind kind = resolve_kind(given, bytes, file, "explain");
+  const StreamInput in = read_stream_input(given, file);
+  const StreamKind kind = resolve_kind(given, in.bytes, file, "explain");
   OutputFile out(o.output);
-  const WalkEnd end = o.json ? explain_json(kind, bytes, out) : explain_table(kind, bytes, out);
+  const WalkEnd end = o.json ? explain_json(kind, in.bytes, in.size, out)
+                             : explain_table(kind, in.bytes, in.size, out);
   out.commit();
-  if (end.problem) bad_input(file + ": " + verdict(kind, end, bytes.size()));
+  if (end.problem) bad_input(file + ": " + verdict(kind, end, in.size));
 }
 
 }  // namespace

@@ -3,7 +3,9 @@
 #include <algorithm>
 
 #include "support/errors.hpp"
+#include "support/files.hpp"
 #include "support/notes.hpp"
+#include "wire/codec.hpp"
 #include "wire/identify.hpp"
 
 namespace kvdata::cli {
@@ -43,6 +45,13 @@ std::string json_hint(const std::string& file, std::span<const Byte> bytes) {
   if (!looks_json) return "";
   return "\n" + file + " looks like a JSON document; to make a stream of it: kvdata encode " +
          file + " -o STREAM.kvs";
+}
+
+StreamInput read_stream_input(std::optional<StreamKind> kind, const std::string& file) {
+  StreamInput in;
+  const std::optional<std::size_t> fixed = kind ? stream_state(*kind)->fixed_bytes() : std::nullopt;
+  in.bytes = read_byte_array(file, fixed.value_or(SIZE_MAX), &in.size);
+  return in;
 }
 
 StreamKind resolve_kind(std::optional<StreamKind> kind, const ByteArray& bytes,

@@ -42,6 +42,16 @@ KindAndFile kind_and_file(const StreamArgs& args);
 // The KIND word; UsageError listing the kinds when it is not one.
 StreamKind require_kind(const std::string& word);
 
+// The stream file of decode and explain. With a fixed-size KIND only the
+// kind's own bytes are read and `size` is the file's whole size, so that a
+// huge file named as a small kind is answered without being read whole.
+struct StreamInput {
+  ByteArray bytes;
+  std::size_t size = 0;
+  bool whole() const { return bytes.size() == size; }
+};
+StreamInput read_stream_input(std::optional<StreamKind> kind, const std::string& file);
+
 // `kind` when given; otherwise the identified kind, announced on standard
 // error (a note: -q silences it). When the stream cannot be told, a
 // UsageError asks for KIND; an empty file is an InputError either way.

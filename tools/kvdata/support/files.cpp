@@ -5,6 +5,7 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <cerrno>
 #include <csignal>
 #include <cstring>
@@ -132,7 +133,7 @@ std::size_t InputFile::read(char* to, std::size_t room) {
   }
 }
 
-ByteArray read_byte_array(const std::string& path) {
+ByteArray read_byte_array(const std::string& path, std::size_t most, std::size_t* whole) {
   constexpr auto kMaxStream = static_cast<std::size_t>(std::numeric_limits<Long>::max());
   const std::string name = is_standard(path) ? "standard input" : path;
   const auto too_long = [&](const std::string& size) {
@@ -143,19 +144,29 @@ ByteArray read_byte_array(const std::string& path) {
   if (file.size() > kMaxStream) too_long(std::to_string(file.size()));
   const Activity reading(name + ": reading the stream");
   ByteArray bytes(0, -1);
-  // One more than the file's size, so that the read that finds the end
-  // needs no growth.
-  bytes.reserve(file.size() + 1);
+  // One more than what is kept, so that the read that finds the end needs
+  // no growth.
+  bytes.reserve(std::min(file.size(), most) + 1);
+  std::size_t size = 0;  // bytes of the file so far, kept or not
   char buf[1 << 16];
   for (;;) {
     const std::size_t n = file.read(buf, sizeof buf);
     if (n == 0) break;
-    const Long at = bytes.ubound() + 1;
-    if (n > kMaxStream - static_cast<std::size_t>(at))
-      too_long("more than " + std::to_string(kMaxStream));
-    bytes.redim_preserve(0, at + static_cast<Long>(n) - 1);
-    std::memcpy(bytes.data() + at, buf, n);
+    if (n > kMaxStream - size) too_long("more than " + std::to_string(kMaxStream));
+    size += n;
+    const auto kept = static_cast<std::size_t>(bytes.ubound() + 1);
+    const std::size_t keep = std::min(n, most - kept);
+    if (keep > 0) {
+      bytes.redim_preserve(0, static_cast<Long>(kept + keep) - 1);
+      std::memcpy(bytes.data() + kept, buf, keep);
+    }
+    // The rest of a regular file is known from its size; a pipe is counted.
+    if (bytes.size() == most && whole != nullptr && file.size() > 0) {
+      size = file.size();
+      break;
+    }
   }
+  if (whole != nullptr) *whole = size;
   return bytes;
 }
 

@@ -11,6 +11,8 @@
 //   ByteArray bytes = read_byte_array(file);
 //   write_output(o.output, text);                   // "-" or empty: standard output
 
+#include <cstddef>
+#include <cstdint>
 #include <initializer_list>
 #include <span>
 #include <string>
@@ -36,7 +38,11 @@ void refuse_output_among_inputs(std::initializer_list<std::string> outputs,
 // array. InputError naming the file when it is missing, unreadable, a
 // directory, or longer than any stream can be (beyond the highest Long; a
 // regular file is refused from its size before anything is read).
-ByteArray read_byte_array(const std::string& path);
+// With `most`, only the file's first `most` bytes are kept, and `whole`
+// receives the file's size: a regular file is read no further, standard
+// input or a pipe is read to its end and counted.
+ByteArray read_byte_array(const std::string& path, std::size_t most = SIZE_MAX,
+                          std::size_t* whole = nullptr);
 // The most of a text file that is read whole (a CGATS file, which Little
 // CMS parses in memory): about 100,000 spectra.
 inline constexpr std::size_t kMaxWholeTextBytes = std::size_t{64} << 20;

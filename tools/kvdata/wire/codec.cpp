@@ -91,8 +91,11 @@ class RecordState final : public StreamState {
  public:
   using Op = bool (Streams::*)(const eStreamDirection&, ByteArray&, Long&, R&...);
 
-  RecordState(StreamKind kind, Op op, std::array<std::string_view, sizeof...(R)> names)
-      : StreamState(kind), op_(op), names_(names) {}
+  RecordState(StreamKind kind, Op op, std::array<std::string_view, sizeof...(R)> names,
+              std::optional<std::size_t> fixed)
+      : StreamState(kind), op_(op), names_(names), fixed_(fixed) {}
+
+  std::optional<std::size_t> fixed_bytes() const override { return fixed_; }
 
   bool read_library(ByteArray& bytes, Long& end, std::string& /*message*/) override {
     end = bytes.has_bounds() ? bytes.lbound() : 0;
@@ -168,6 +171,7 @@ class RecordState final : public StreamState {
 
   Op op_;
   std::array<std::string_view, sizeof...(R)> names_;
+  std::optional<std::size_t> fixed_;
   std::tuple<R...> records_;
 };
 
@@ -175,8 +179,9 @@ template <class... R>
 std::unique_ptr<StreamState> records(StreamKind kind,
                                      bool (Streams::*op)(const eStreamDirection&, ByteArray&, Long&,
                                                          R&...),
-                                     std::array<std::string_view, sizeof...(R)> names) {
-  return std::make_unique<RecordState<R...>>(kind, op, names);
+                                     std::array<std::string_view, sizeof...(R)> names,
+                                     std::optional<std::size_t> fixed = std::nullopt) {
+  return std::make_unique<RecordState<R...>>(kind, op, names, fixed);
 }
 
 // --- Object streams ---------------------------------------------------------------------
@@ -354,6 +359,12 @@ class ObjectState final : public StreamState {
  public:
   explicit ObjectState(StreamKind kind) : StreamState(kind) {}
 
+  // A class of fixed stream size says so; its writer leaves one spare byte.
+  std::optional<std::size_t> fixed_bytes() const override {
+    if constexpr (requires { Class::kStreamBytes; }) return Class::kStreamBytes + 1;
+    return std::nullopt;
+  }
+
   bool read_library(ByteArray& bytes, Long& end, std::string& message) override {
     read_ = Class::create();
     end = bytes.has_bounds() ? bytes.lbound() : 0;
@@ -431,7 +442,7 @@ std::unique_ptr<StreamState> stream_state(StreamKind kind) {
     case StreamKind::TestRun:
       return object<KVTestRun>(kind);
     case StreamKind::SCPair:
-      return records(kind, &S::Stream_SCPair, {"SCP"});
+      return records(kind, &S::Stream_SCPair, {"SCP"}, S::kSCPairBytes);
     case StreamKind::TileSetCalibration:
       return records(kind, &S::Stream_TileSetCalibration, {"TS", "TSC"});
     case StreamKind::ProfileRecord:
@@ -441,9 +452,9 @@ std::unique_ptr<StreamState> stream_state(StreamKind kind) {
     case StreamKind::TestRunRecord:
       return records(kind, &S::Stream_TestRun, {"TR"});
     case StreamKind::UserBlock:
-      return records(kind, &S::Stream_User, {"User"});
+      return records(kind, &S::Stream_User, {"User"}, S::kUserBlockBytes);
     case StreamKind::Organization:
-      return records(kind, &S::Stream_Organization, {"Org"});
+      return records(kind, &S::Stream_Organization, {"Org"}, S::kOrganizationBlockBytes);
   }
   bad_usage("internal error: no stream of kind " + std::to_string(static_cast<int>(kind)));
 }

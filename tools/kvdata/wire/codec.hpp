@@ -50,6 +50,9 @@ class StreamState {
  public:
   virtual ~StreamState() = default;
   StreamKind kind() const { return kind_; }
+  // The size of every stream of a fixed-size kind, the spare byte of an
+  // object stream included: its reader takes no more. None for the others.
+  virtual std::optional<std::size_t> fixed_bytes() const = 0;
 
   // The library's reader alone, from the array's first element, as
   // whatever observer is installed watches it: whether it took the stream,

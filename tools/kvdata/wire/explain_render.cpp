@@ -205,14 +205,14 @@ std::string value_text(const StreamField& f, std::span<const Byte> stream) {
                     f.value);
 }
 
-WalkEnd explain_table(StreamKind kind, const ByteArray& bytes, OutputFile& out) {
+WalkEnd explain_table(StreamKind kind, const ByteArray& bytes, std::size_t size, OutputFile& out) {
   const std::span<const Byte> stream = whole(bytes);
   LongestPath longest;
   {
     const LibraryLog drop;  // the walk below keeps them
-    static_cast<void>(walk_stream(kind, bytes, longest));
+    static_cast<void>(walk_stream(kind, bytes, longest, size));
   }
-  const std::size_t size_digits = digits(stream.size());
+  const std::size_t size_digits = digits(size);
   // A walk that stops names the field where it stops: a path no longer than
   // the longest one walked, or a description of what follows the encoding.
   const Columns columns{std::max<std::size_t>(size_digits, 6),
@@ -221,11 +221,10 @@ WalkEnd explain_table(StreamKind kind, const ByteArray& bytes, OutputFile& out) 
                         std::max({longest.longest, stream_names::kEndOfStream.size(),
                                   stream_names::kSpareByte.size()})};
 
-  out.write(std::string(kind_name(kind)) + " stream, " + std::to_string(stream.size()) +
-            " bytes\n\n");
+  out.write(std::string(kind_name(kind)) + " stream, " + std::to_string(size) + " bytes\n\n");
   out.write(table_row(columns, "offset", "width", "bytes", "field", "value"));
   TableRows rows(columns, stream, out);
-  const WalkEnd end = walk_stream(kind, bytes, rows);
+  const WalkEnd end = walk_stream(kind, bytes, rows, size);
   if (end.problem) {
     const std::size_t at = std::min(end.problem->offset, stream.size());
     out.write(
@@ -235,18 +234,18 @@ WalkEnd explain_table(StreamKind kind, const ByteArray& bytes, OutputFile& out) 
   }
   // Appended piece by piece (GCC 12 warns falsely about "\n" + text at -O3).
   std::string tail(1, '\n');
-  tail += verdict(kind, end, stream.size());
+  tail += verdict(kind, end, size);
   tail += '\n';
   out.write(tail);
   return end;
 }
 
-WalkEnd explain_json(StreamKind kind, const ByteArray& bytes, OutputFile& out) {
+WalkEnd explain_json(StreamKind kind, const ByteArray& bytes, std::size_t size, OutputFile& out) {
   const std::span<const Byte> stream = whole(bytes);
   out.write("{\n  \"kind\": " + Json(std::string(kind_name(kind))).dump() +
-            ",\n  \"size\": " + std::to_string(stream.size()) + ",\n  \"fields\": [");
+            ",\n  \"size\": " + std::to_string(size) + ",\n  \"fields\": [");
   JsonRows rows(stream, out);
-  const WalkEnd end = walk_stream(kind, bytes, rows);
+  const WalkEnd end = walk_stream(kind, bytes, rows, size);
   out.write("\n  ],\n  \"problem\": ");
   if (end.problem) {
     Json p = Json::object();

@@ -7,7 +7,7 @@
 // first walk that keeps only the longest path sizes the field column.
 //
 //   OutputFile out(path);
-//   const WalkEnd end = explain_table(StreamKind::User, bytes, out);
+//   const WalkEnd end = explain_table(StreamKind::User, bytes, size, out);
 //   out.commit();
 
 #include <cstddef>
@@ -29,10 +29,11 @@ std::string hex_bytes(std::span<const Byte> bytes, std::size_t limit = 8);
 std::string value_text(const StreamField& f, std::span<const Byte> stream);
 
 // A heading, the table of fields, the row where the walk stops (if it does)
-// and the verdict.
-WalkEnd explain_table(StreamKind kind, const ByteArray& bytes, OutputFile& out);
+// and the verdict. `size`: the stream's whole size, when `bytes` holds only
+// its start (as for walk_stream).
+WalkEnd explain_table(StreamKind kind, const ByteArray& bytes, std::size_t size, OutputFile& out);
 
 // {"kind", "size", "fields": [{"offset", "width", "bytes", "field", "value"}, ...], "problem"}.
-WalkEnd explain_json(StreamKind kind, const ByteArray& bytes, OutputFile& out);
+WalkEnd explain_json(StreamKind kind, const ByteArray& bytes, std::size_t size, OutputFile& out);
 
 }  // namespace kvdata::cli

@@ -56,8 +56,7 @@ class Walker : public StreamObserver {
 };
 
 // The end-of-stream rules after a reader that accepted the stream.
-void finish(StreamKind kind, const ByteArray& bytes, std::size_t end, Walker& walker) {
-  const std::size_t size = bytes.has_bounds() ? bytes.size() : 0;
+void finish(StreamKind kind, std::size_t size, std::size_t end, Walker& walker) {
   if (end >= size) return;
   std::size_t left = size - end;
   if (info(kind).object) {
@@ -76,7 +75,8 @@ void finish(StreamKind kind, const ByteArray& bytes, std::size_t end, Walker& wa
 
 }  // namespace
 
-WalkEnd walk_stream(StreamKind kind, const ByteArray& bytes, WalkSink& sink) {
+WalkEnd walk_stream(StreamKind kind, const ByteArray& bytes, WalkSink& sink,
+                    std::optional<std::size_t> size) {
   Walker walker(bytes, sink);
   bool accepted = false;
   Long end = 0;
@@ -93,7 +93,7 @@ WalkEnd walk_stream(StreamKind kind, const ByteArray& bytes, WalkSink& sink) {
   walker.rethrow();
   const auto stopped = static_cast<std::size_t>(std::max<Long>(end - walker.lower_, 0));
   if (accepted) {
-    finish(kind, bytes, stopped, walker);
+    finish(kind, size.value_or(bytes.has_bounds() ? bytes.size() : 0), stopped, walker);
     walker.rethrow();
   } else if (!walker.problem_) {
     // A refusal the reader did not explain (it ran out of memory, say).
@@ -150,9 +150,9 @@ std::string field_at(StreamKind kind, std::span<const Byte> bytes, std::size_t o
   return find.found_;
 }
 
-WalkEnd walk_stream(StreamKind kind, const ByteArray& bytes) {
+WalkEnd walk_stream(StreamKind kind, const ByteArray& bytes, std::optional<std::size_t> size) {
   Ignore ignore;
-  return walk_stream(kind, bytes, ignore);
+  return walk_stream(kind, bytes, ignore, size);
 }
 
 }  // namespace kvdata::cli

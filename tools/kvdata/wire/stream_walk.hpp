@@ -46,7 +46,11 @@ struct WalkEnd {
 // Offsets count from the array's lower bound. An error the sink raises
 // stops the walk and is raised again once the reader has returned. When
 // there is a problem the library's log entries are kept (library_log.hpp).
-WalkEnd walk_stream(StreamKind kind, const ByteArray& bytes, WalkSink& sink);
+// `size`: the whole stream's size when `bytes` holds only its start (the
+// bytes of a fixed-size kind, read from a longer file); the bytes beyond
+// count as bytes that follow the stream.
+WalkEnd walk_stream(StreamKind kind, const ByteArray& bytes, WalkSink& sink,
+                    std::optional<std::size_t> size = std::nullopt);
 
 // One line: "The whole stream reads as KIND (N bytes)." or where it stops and why.
 std::string verdict(StreamKind kind, const WalkEnd& end, std::size_t size);
@@ -55,6 +59,7 @@ std::string verdict(StreamKind kind, const WalkEnd& end, std::size_t size);
 // "TS.Tiles(2).Name (offset 170, 9 bytes)", or "" outside every field.
 std::string field_at(StreamKind kind, std::span<const Byte> bytes, std::size_t offset);
 // A walk that only looks for the problem.
-WalkEnd walk_stream(StreamKind kind, const ByteArray& bytes);
+WalkEnd walk_stream(StreamKind kind, const ByteArray& bytes,
+                    std::optional<std::size_t> size = std::nullopt);
 
 }  // namespace kvdata::cli
