@@ -1,5 +1,6 @@
 #include <gtest/gtest.h>
 
+#include <string_view>
 #include <vector>
 
 #include "kvdata/automation/ansi.hpp"
@@ -37,7 +38,39 @@ TEST(Text, TrimsBlanksOnlyAndFoldsCase) {
   EXPECT_TRUE(equal_ignore_case(u"TolSet", u"TOLSET"));
   EXPECT_TRUE(equal_ignore_case(u"\u00e9t\u00e9", u"\u00c9T\u00c9"));
   EXPECT_FALSE(equal_ignore_case(u"TestRun", u"TestRuns"));
-  EXPECT_EQ(from_utf8(to_utf8(u"caf\u00e9 \U0001F600")), u"caf\u00e9 \U0001F600");
+}
+
+// UTF-8 at the edges of each sequence length; `both` rows convert both ways,
+// the others are malformed input, each bad byte or sequence one U+FFFD.
+TEST(Text, Utf8AtTheEdgesOfEachSequenceLength) {
+  const struct {
+    std::string_view utf8;
+    std::u16string_view utf16;
+    bool both;
+  } cases[] = {
+      {"\x7F", u"\u007F", true},
+      {"\xC2\x80\xC2\xA9", u"\u0080\u00A9", true},
+      {"\xDF\xBF\xE0\xA0\x80", u"\u07FF\u0800", true},
+      {"\xEF\xBF\xBF\xF0\x90\x80\x80", u"\uFFFF\U00010000", true},
+      {"\xF4\x8F\xBF\xBF", u"\U0010FFFF", true},
+      {"\x80\xBF", u"\uFFFD\uFFFD", false},                      // continuation bytes alone
+      {"\xC0\xAF\xC1\xBF", u"\uFFFD\uFFFD\uFFFD\uFFFD", false},  // overlong two-byte leads
+      {"\xE0\x9F\xBF\xED\xA0\x80", u"\uFFFD\uFFFD", false},      // overlong, surrogate
+      {"\xF0\x8F\xBF\xBF\xF4\x90\x80\x80", u"\uFFFD\uFFFD", false},
+      {"\xF5\x80\x80\x80\xE2\x82", u"\uFFFD\uFFFD\uFFFD\uFFFD\uFFFD\uFFFD",
+       false},  // no such lead; cut short
+  };
+  for (const auto& c : cases) {
+    EXPECT_EQ(from_utf8(c.utf8), c.utf16) << ::testing::PrintToString(std::string(c.utf8));
+    if (c.both) {
+      EXPECT_EQ(to_utf8(c.utf16), c.utf8);
+    }
+  }
+  // A lone surrogate is written as U+FFFD.
+  EXPECT_EQ(to_utf8(u"a\xD800"
+                    u"b\xDC00"),
+            "a\xEF\xBF\xBD"
+            "b\xEF\xBF\xBD");
 }
 
 }  // namespace
