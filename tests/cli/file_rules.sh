@@ -40,6 +40,13 @@ cp "$examples/streams/user.kvs" user.kvs
 cp "$examples/json/user.json" user.json
 cp "$examples/spectra/tiles.csv" self.csv
 
+# The FIFO's reader has seen the end of what was written (waits up to 20 s,
+# as a loaded machine may need).
+reader_done() {
+  for _ in $(seq 400); do kill -0 "$(cat reader)" 2>/dev/null || return 0; sleep 0.05; done
+  return 1
+}
+
 # Each case: a name, its set-up, the command's words, then the checks.
 cases() {
   c "new file: 0666 under the umask" '' \
@@ -51,7 +58,7 @@ cases() {
   c "dangling link makes its target" 'ln -s made.kvs dangling.kvs' \
     'encode user.json -o dangling.kvs' '[ $code = 0 ] && [ -L dangling.kvs ] && cmp -s made.kvs user.kvs'
   c "FIFO written in place" 'mkfifo fifo; (cat fifo >from-fifo & echo $! >reader)' \
-    'decode user.kvs -o fifo' '[ $code = 0 ] && [ "$(type_of fifo)" = fifo ] && sleep 0.2 && cmp -s from-fifo "$examples/json/user.json"'
+    'decode user.kvs -o fifo' '[ $code = 0 ] && [ "$(type_of fifo)" = fifo ] && reader_done && cmp -s from-fifo "$examples/json/user.json"'
   c "device node written in place" 'mknod null c 1 3' \
     'decode user.kvs -o null' '[ $code = 0 ] && [ "$(type_of null)" = "character special file" ]'
   c "full device: exit 1, node kept" 'mknod full c 1 7' \
@@ -106,7 +113,7 @@ for signal in INT TERM HUP; do
   pid=$!
   exec 3>rows
   { head -1 self.csv; yes "$(sed -n 2p self.csv)" | head -5000; } >&3  # past the first block
-  for _ in $(seq 100); do ls -A | grep -q '^\.kvdata-' && break; sleep 0.05; done
+  for _ in $(seq 400); do ls -A | grep -q '^\.kvdata-' && break; sleep 0.05; done
   check '! no_temporary' || { exec 3>&-; wait $pid; continue; }
   kill -s "$signal" $pid
   wait $pid
