@@ -269,6 +269,7 @@ TEST(KVTestRunSpreadTestData, CopiesShareSamplesButReleaseOnlyItsOwnReferences) 
   // Releasing the copy, or destroying it, leaves a's samples in place.
   EXPECT_EQ(b->KVRR_ReleaseSpreadTestData(), 0);
   EXPECT_EQ(b->KVRR_GetWhiteRepeatibilitySpectralData(), nullptr);
+  EXPECT_EQ(b->KVRR_GetBlueRepeatibilitySpectralData(), nullptr);
   EXPECT_EQ(table(b->KVRR_GetAverageWL()).rank(), 0);
   EXPECT_EQ(b->KVRR_GetNumberOfSpectralDataPoints(), 0);
   EXPECT_EQ(b->KVRR_AddSpectralData(sample({3.0f, 4.0f})), Spread::kNotReady);
