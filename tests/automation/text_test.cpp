@@ -29,6 +29,8 @@ TEST(Windows1252, UnrepresentableCharactersBecomeQuestionMarks) {
   // character and a surrogate pair (one character, one '?').
   const String text = u"a\u0100\u0080\u4E2D\U0001F600z";
   EXPECT_EQ(ansi::encode(text), (std::vector<Byte>{'a', '?', '?', '?', '?', 'z'}));
+  // A high surrogate before a character that is not a low one stands alone.
+  EXPECT_EQ(ansi::encode(u"a\xD800\xE000"), (std::vector<Byte>{'a', '?', '?'}));
 }
 
 TEST(Text, TrimsBlanksOnlyAndFoldsCase) {
