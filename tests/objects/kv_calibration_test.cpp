@@ -53,19 +53,6 @@ ByteArray block_of(KVCalibration& cal) {
   return bytes;
 }
 
-TEST(KVCalibration, NewCalibrationIsAllZero) {
-  auto cal = KVCalibration::create();
-  EXPECT_EQ(cal->TSN(), String(8, u'\0'));
-  EXPECT_EQ(cal->v1Calibration().TSN, String(8, u'\0'));  // only blanks are trimmed
-  EXPECT_EQ(cal->ID().get<String>(), String(8, u'\0'));
-  EXPECT_EQ(cal->DateCreated().get<Date>(), Date{0.0});
-  EXPECT_EQ(cal->TempCalibrated(), 0.0f);
-  EXPECT_EQ(cal->StreamLen(), 4188);
-  const ByteArray bytes = block_of(*cal);
-  EXPECT_EQ(bytes.ubound(), 4188);
-  EXPECT_EQ(slice(bytes, 0, 4189), Bytes(4189, 0));
-}
-
 TEST(KVCalibration, TsnIsEightUnitsCutOrPadded) {
   auto cal = KVCalibration::create();
   cal->TSN(u"1234567890");
@@ -176,41 +163,6 @@ TEST(KVCalibration, CalibrationErrors) {
   EXPECT_EQ(after.TempCalibrated, -4.0f);
   EXPECT_EQ(after.Tiles(12), shifted.Tiles(12));
   EXPECT_EQ(after.Tiles(13), filled_record().Tiles(13));
-}
-
-TEST(KVCalibration, StreamInReadsTheWholeBlockOrNothing) {
-  auto source = KVCalibration::create();
-  source->v1Calibration(filled_record());
-  const ByteArray image = block_of(*source);
-  const Bytes block = slice(image, 0, 4188);
-
-  // Exactly 4188 bytes, from a stream that starts at index 1.
-  auto cal = KVCalibration::create();
-  ByteArray exact = stream_of(block, 1);
-  Long position = 1;
-  ASSERT_TRUE(cal->StreamIn(exact, position));
-  EXPECT_EQ(position, 4189);
-  EXPECT_EQ(cal->v1Calibration(), filled_record());
-  EXPECT_EQ(cal->TSN(), u"TS-042  ");
-}
-
-TEST(KVCalibration, StreamOutRoundTrip) {
-  auto cal = KVCalibration::create();
-  cal->v1Calibration(filled_record());
-  ByteArray bytes = stream_of(Bytes(10, 0xAA), 1);  // a stream loaded from a file
-  Long position = 3;
-  ASSERT_TRUE(cal->StreamOut(bytes, position));
-  EXPECT_EQ(position, 3 + 4188);
-  EXPECT_EQ(bytes.lbound(), 0);
-  EXPECT_EQ(bytes.ubound(), position);
-  EXPECT_EQ(slice(bytes, 0, 3), (Bytes{0x00, 0xAA, 0xAA}));
-
-  auto copy = KVCalibration::create();
-  Long read = 3;
-  ASSERT_TRUE(copy->StreamIn(bytes, read));
-  EXPECT_EQ(read, position);
-  EXPECT_EQ(copy->v1Calibration(), cal->v1Calibration());
-  EXPECT_EQ(copy->TSN(), cal->TSN());
 }
 
 TEST(KVCalibration, TilesKeepTheirCalibrationAlive) {

@@ -214,23 +214,17 @@ TEST(KVProfile, CorrectionIndicesOutsideTheTablesRaiseError9AndChangeNothing) {
   EXPECT_EQ(p->LinearCorrection(kSCI, 40), table_value(3, 1, 40));
 }
 
-// Another stamp, no bounds, a Position outside the stream: False, nothing read.
+// No bounds, a Position outside the stream: False, nothing read (other
+// stamps and cut streams: tests/data/cut-streams.txt).
 TEST(KVProfile, StreamInRefusesStreamsItCannotReadAndChangesNothing) {
   LogCapture log;
   const Bytes full = encoding(*source_profile());
-  auto stamped = [&](Bytes stamp) {
-    std::copy(full.begin() + 4, full.end(), std::back_inserter(stamp));
-    return stream_of(stamp);
-  };
   const struct {
     const char* name;
     ByteArray stream;
     Long start, stop;
     std::size_t logged;  // event-log entries
   } cases[] = {
-      {"stamp 1.2", stamped({0x9A, 0x99, 0x99, 0x3F}), 0, 4, 0},
-      {"the Single next to 1.4", stamped({0x34, 0x33, 0xB3, 0x3F}), 0, 4, 0},
-      {"stamp 1.6", stamped({0xCD, 0xCC, 0xCC, 0x3F}), 0, 4, 0},
       {"no bounds", ByteArray{}, 0, 0, 1},
       {"negative Position", stream_of(full), -3, -3, 1},
       {"Position near the top", stream_of(full), kLongMax - 1, kLongMax - 1, 1},
@@ -246,103 +240,6 @@ TEST(KVProfile, StreamInRefusesStreamsItCannotReadAndChangesNothing) {
     EXPECT_EQ(log.entries.size(), c.logged);
     log.entries.clear();
   }
-}
-
-TEST(KVProfile, EveryTruncationGivesFalseWithWhatWasReadBeforeIt) {
-  const auto source = source_profile();
-  const Bytes full = encoding(*source);
-  ASSERT_EQ(full.size(), 1653u);
-  const auto old = old_profile();
-
-  for (std::size_t n = 0; n < full.size(); ++n) {
-    SCOPED_TRACE(n);
-    LogCapture log;
-    auto p = old_profile();
-    Long pos = 0;
-    ASSERT_FALSE(p->StreamIn(stream_of(prefix(full, n)), pos));
-    EXPECT_EQ(log.entries.size(), 1u);  // the one value that could not be read
-
-    EXPECT_EQ(p->StartWL(), n >= 8 ? 380 : 1);
-    EXPECT_EQ(p->EndWl(), n >= 12 ? 730 : 2);
-    EXPECT_EQ(p->Interval(), n >= 16 ? 10 : 3);
-    // A count that cannot be read yields the empty text; a body that cannot
-    // be read leaves the text as it was.
-    if (n < 16) {
-      EXPECT_EQ(p->ISN(), u"OLD");
-    } else if (n < 20) {
-      EXPECT_EQ(p->ISN(), u"");
-    } else if (n < 24) {
-      EXPECT_EQ(p->ISN(), u"OLD");
-    } else {
-      EXPECT_EQ(p->ISN(), u"SN-7");
-    }
-    EXPECT_EQ(p->Created(), n >= 32 ? Date{45000.5} : Date{1.0});
-    EXPECT_EQ(p->Validated(), n >= 33);
-    // Tables only from a whole record; no band-width value before that.
-    EXPECT_TRUE(tables_equal(*p, n >= 1333 ? *source : *old));
-    for (Long k = 0; k <= 1; ++k) {
-      for (Long band = 1; band <= 40; ++band) {
-        const auto sc = static_cast<eSC>(k);
-        const std::size_t end = 1333 + static_cast<std::size_t>((k * 40 + band) * 4);
-        const Single expected =
-            n >= end ? source->BandWidthCorrection(sc, band) : old->BandWidthCorrection(sc, band);
-        ASSERT_EQ(p->BandWidthCorrection(sc, band), expected) << k << " " << band;
-      }
-    }
-    // Position stops at the start of the value that could not be read.
-    Long stop = pos;
-    if (n < 4) {
-      stop = 0;
-    } else if (n < 8) {
-      stop = 4;
-    } else if (n >= 1333) {
-      stop = static_cast<Long>(1333 + (n - 1333) / 4 * 4);
-    }
-    EXPECT_EQ(pos, stop);
-  }
-}
-
-TEST(KVProfile, AnotherTypeNameStopsBeforeTheBandWidthValues) {
-  LogCapture log;
-  Bytes bytes = encoding(*source_profile());
-  patch(bytes, 52, {'2'});  // "tOVProfileDataV2"
-  auto p = old_profile();
-  const auto old = old_profile();
-  Long pos = 0;
-  EXPECT_FALSE(p->StreamIn(stream_of(bytes), pos));
-  EXPECT_EQ(pos, 53);
-  EXPECT_EQ(p->StartWL(), 380);
-  EXPECT_EQ(p->EndWl(), 730);
-  EXPECT_EQ(p->Interval(), 10);
-  EXPECT_EQ(p->ISN(), u"SN-7");
-  EXPECT_EQ(p->Created(), Date{45000.5});
-  EXPECT_TRUE(p->Validated());
-  EXPECT_TRUE(tables_equal(*p, *old));
-  EXPECT_EQ(p->BandWidthCorrection(kSCE, 1), old->BandWidthCorrection(kSCE, 1));
-  EXPECT_EQ(p->BandWidthCorrection(kSCI, 40), old->BandWidthCorrection(kSCI, 40));
-  EXPECT_TRUE(log.entries.empty());
-}
-
-TEST(KVProfile, StreamInFromAFileStreamStartsAtIndexOne) {
-  const Bytes full = encoding(*source_profile());
-  auto p = old_profile();
-  Long pos = 1;
-  EXPECT_TRUE(p->StreamIn(stream_of(full, 1), pos));
-  EXPECT_EQ(pos, 1 + 1653);
-  EXPECT_EQ(p->ISN(), u"SN-7");
-}
-
-TEST(KVProfile, StreamLenIsWhatStreamOutWrites) {
-  auto p = source_profile();
-  p->ISN(u"ABC\u20AC");  // the euro sign takes one byte
-  const Long len = p->StreamLen();
-  EXPECT_EQ(len, 1649 + 4);
-  ByteArray stream;
-  Long pos = 0;
-  EXPECT_TRUE(p->StreamOut(stream, pos));
-  EXPECT_EQ(pos, len);
-  EXPECT_EQ(stream.ubound(), len);
-  EXPECT_EQ(p->ISN(), u"ABC\u20AC");
 }
 
 }  // namespace

@@ -31,12 +31,6 @@ Bytes slice(const Bytes& bytes, std::size_t from, std::size_t to) {
                bytes.begin() + static_cast<std::ptrdiff_t>(to));
 }
 
-Bytes concat(std::initializer_list<Bytes> parts) {
-  Bytes all;
-  for (const Bytes& p : parts) all.insert(all.end(), p.begin(), p.end());
-  return all;
-}
-
 tIIATile iia_tile(float base) {
   tIIATile tile;
   for (Long k = 0; k <= 1; ++k) {
@@ -99,14 +93,6 @@ std::shared_ptr<KVTestRun> run_with(const tTestRun1& record, const String& light
   return run;
 }
 
-tTestRun1 old_record() {
-  tTestRun1 r;
-  r.ISN = u"OLD";
-  r.UserNumber = 3;
-  r.Comment = u"old";
-  return r;
-}
-
 TEST(KVTestRun, StreamStartsWithTheVersionAndEndsWithTheLightLevelData) {
   tTestRun1 record;
   record.ISN = u"SN1";
@@ -163,52 +149,6 @@ TEST(KVTestRun, RoundTripIntoAFreshObject) {
   EXPECT_EQ(fresh->DateCreated().get<Date>(), Date{45123.25});
 }
 
-TEST(KVTestRun, TheVersionReadIsTheVersionWrittenNext) {
-  LogCapture log;
-  Bytes bytes = encoding(*run_with(full_record(), u"x"));
-  std::copy(kStamp12.begin(), kStamp12.end(), bytes.begin());
-  auto run = KVTestRun::create();
-  Long pos = 0;
-  EXPECT_TRUE(run->StreamIn(stream_of(bytes), pos));
-  EXPECT_EQ(pos, static_cast<Long>(bytes.size()));
-  EXPECT_EQ(encoding(*run), bytes);
-  EXPECT_TRUE(log.entries.empty());
-}
-
-TEST(KVTestRun, EveryTruncationGivesFalseWithWhatWasReadBeforeIt) {
-  const tTestRun1 source = full_record();
-  Bytes full = encoding(*run_with(source, u"light"));
-  std::copy(kStamp12.begin(), kStamp12.end(), full.begin());
-  const std::size_t text_bytes = 4 + 5;
-  const std::size_t record_end = full.size() - text_bytes;
-  const Bytes source_record = slice(full, 4, record_end);
-
-  const Bytes old_full = encoding(*run_with(old_record(), u"old-text"));
-  const Bytes old_tail = slice(old_full, 4, old_full.size());  // record and old text
-
-  for (std::size_t n = 0; n < full.size(); ++n) {
-    SCOPED_TRACE(n);
-    LogCapture log;
-    auto run = run_with(old_record(), u"old-text");
-    Long pos = 0;
-    ASSERT_FALSE(run->StreamIn(stream_of(prefix(full, n)), pos));
-    EXPECT_LE(log.entries.size(), 1u);
-    if (n < 4) {
-      EXPECT_EQ(pos, 0);
-      ASSERT_EQ(encoding(*run), old_full);
-    } else if (n < record_end) {
-      // The version is replaced; the record only as a whole, so not at all.
-      ASSERT_EQ(encoding(*run), concat({kStamp12, old_tail}));
-    } else {
-      // The record went through; the text that could not be read stays.
-      EXPECT_EQ(run->v1TestRun(), decoded(source));
-      ASSERT_EQ(encoding(*run), concat({kStamp12, source_record,
-                                        slice(old_full, old_full.size() - 12, old_full.size())}));
-      EXPECT_EQ(pos, static_cast<Long>(n < record_end + 4 ? record_end : record_end + 4));
-    }
-  }
-}
-
 TEST(KVTestRun, RecordThatCannotBeWrittenCarriesNoLightLevelData) {
   tTestRun1 record = full_record();
   record.IIA.Measurements(1).Tiles.redim(40000, 40000);  // outside the 16-bit tile index
@@ -243,18 +183,6 @@ TEST(KVTestRun, ReadingFromANegativePositionChangesNothing) {
   pos = kLongMax - 2;
   EXPECT_FALSE(run->StreamIn(stream_of(before), pos));
   EXPECT_EQ(encoding(*run), before);
-}
-
-TEST(KVTestRun, RecordIsCopiedWholeBothWays) {
-  tTestRun1 record = full_record();
-  auto run = run_with(record, u"");
-  record.IIA.Measurements(1).Tiles(1).Trial.Spectrum(eSC::SCI).Data(5) = -1.0f;
-  record.ISN = u"changed";
-  tTestRun1 copy = run->v1TestRun();
-  EXPECT_EQ(copy, full_record());
-  copy.IIA.Measurements(2).Tiles(1).TrialProfiled.Spectrum(eSC::SCE).Data(1) = 99.0f;
-  copy.IIA.Measurements(2).Tiles.erase();
-  EXPECT_EQ(run->v1TestRun(), full_record());
 }
 
 TEST(KVTestRun, IdentityValuesAndRights) {

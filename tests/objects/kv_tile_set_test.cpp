@@ -58,24 +58,6 @@ std::shared_ptr<KVTileSet> filled_set() {
   return set;
 }
 
-TEST(KVTileSet, NewSetHasThirteenEmptyTiles) {
-  auto set = KVTileSet::create();
-  EXPECT_EQ(set->count(), 13);
-  EXPECT_EQ(set->TSN(), u"");
-  EXPECT_EQ(set->ID().type(), VarType::String);
-  EXPECT_EQ(set->ID().get<String>(), u"");
-  EXPECT_TRUE(set->DateCreated().is_empty());
-  EXPECT_EQ(set->StreamLen(), 3436);
-  const tTileSet record = set->v1TileSet();
-  EXPECT_EQ(record.Tiles.lbound(), 1);
-  EXPECT_EQ(record.Tiles.ubound(), 13);
-  EXPECT_EQ(record.Tiles(13), tTileDef{});
-
-  set->TSN(u"Caf\u00e9 \u20ac");  // Windows-1252 has both: one byte each
-  EXPECT_EQ(set->StreamLen(), 4 + 6 + 3432);
-  EXPECT_EQ(set->ID().get<String>(), u"Caf\u00e9 \u20ac");
-}
-
 TEST(KVTileSet, TilesAreWrittenBackAtTheirOrder) {
   auto set = filled_set();
   const tTileSet before = set->v1TileSet();

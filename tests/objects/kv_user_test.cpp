@@ -135,15 +135,4 @@ TEST(KVUser, StreamInFromAnotherLowerBound) {
   EXPECT_EQ(user->ErrMsg(), u"Subscript out of range");
 }
 
-TEST(KVUser, IdentityAndRecordCopies) {
-  auto user = KVUser::create();
-  EXPECT_TRUE(user->ID().is_empty());
-  EXPECT_TRUE(user->DateCreated().is_empty());
-  EXPECT_EQ(user->StreamLen(), 848);
-  tUser record = sample_user();
-  user->v1User(record);
-  record.USERID = u"CHANGED";
-  EXPECT_EQ(user->v1User().USERID, u"ABCD");
-}
-
 }  // namespace

@@ -169,39 +169,5 @@ TEST(TestRunStream, WriterRefusesSeriesBeyondTheSixteenBitCounter) {
   EXPECT_EQ(log.entries.size(), 1u);
 }
 
-TEST(TestRunStream, ReaderRefusesShortStreamsAndLeavesTheRecordUnchanged) {
-  LogCapture log;
-  tTestRun1 written = test_run(true);
-  ByteArray full(0, -1);
-  Long pos = 0;
-  ASSERT_TRUE(streams().Stream_TestRun(kTo, full, pos, written));
-  const Bytes bytes = contents(full);
-  const tTestRun1 before = test_run(false);
-  for (std::size_t cut = 0; cut < bytes.size(); ++cut) {
-    log.entries.clear();
-    ByteArray stream = stream_of(Bytes(bytes.begin(), bytes.begin() + static_cast<long>(cut)));
-    tTestRun1 tr = before;
-    pos = 0;
-    EXPECT_FALSE(streams().Stream_TestRun(kFrom, stream, pos, tr)) << cut;
-    EXPECT_EQ(tr, before) << cut;
-    EXPECT_LE(log.entries.size(), 1u) << cut;
-  }
-
-  // A tile count that cannot fit is refused before its tiles are allocated.
-  // Up to the first series' count: the second series (8 + 2 + 640), the
-  // first one's tiles (2 * 640) and its count (2) cut off.
-  Bytes hostile(bytes.begin(), bytes.end() - (8 + 2 + 640) - 2 * 640 - 2);
-  hostile.push_back(0xFF);
-  hostile.push_back(0x7F);  // 32767 tiles
-  hostile.resize(hostile.size() + 1000);
-  ByteArray stream = stream_of(hostile);
-  tTestRun1 tr = before;
-  pos = 0;
-  testing::reset_largest_allocation();
-  EXPECT_FALSE(streams().Stream_TestRun(kFrom, stream, pos, tr));
-  EXPECT_LT(testing::largest_allocation(), 100000u);
-  EXPECT_EQ(tr, before);
-}
-
 }  // namespace
 }  // namespace kvdata
