@@ -73,19 +73,6 @@ std::shared_ptr<KVProfile> source_profile() {
   return p;
 }
 
-// The profile that the reading tests decode into, with other values everywhere.
-std::shared_ptr<KVProfile> old_profile() {
-  auto p = KVProfile::create();
-  p->ISN(u"OLD");
-  p->Created(Date{1.0});
-  p->Validated(false);
-  p->StartWL(1);
-  p->EndWl(2);
-  p->Interval(3);
-  fill(*p, 10);
-  return p;
-}
-
 bool tables_equal(const KVProfile& a, const KVProfile& b) {
   for (Long k = 0; k <= 1; ++k) {
     const auto sc = static_cast<eSC>(k);
@@ -212,34 +199,6 @@ TEST(KVProfile, CorrectionIndicesOutsideTheTablesRaiseError9AndChangeNothing) {
   EXPECT_EQ(error_number([&] { p->DarkCorrection(sc2, 40, 1.0f); }), kSubscriptOutOfRange);
   EXPECT_EQ(encoding(*p), before);
   EXPECT_EQ(p->LinearCorrection(kSCI, 40), table_value(3, 1, 40));
-}
-
-// No bounds, a Position outside the stream: False, nothing read (other
-// stamps and cut streams: tests/data/cut-streams.txt).
-TEST(KVProfile, StreamInRefusesStreamsItCannotReadAndChangesNothing) {
-  LogCapture log;
-  const Bytes full = encoding(*source_profile());
-  const struct {
-    const char* name;
-    ByteArray stream;
-    Long start, stop;
-    std::size_t logged;  // event-log entries
-  } cases[] = {
-      {"no bounds", ByteArray{}, 0, 0, 1},
-      {"negative Position", stream_of(full), -3, -3, 1},
-      {"Position near the top", stream_of(full), kLongMax - 1, kLongMax - 1, 1},
-  };
-  for (const auto& c : cases) {
-    SCOPED_TRACE(c.name);
-    auto p = old_profile();
-    const Bytes before = encoding(*p);
-    Long pos = c.start;
-    EXPECT_FALSE(p->StreamIn(c.stream, pos));
-    EXPECT_EQ(pos, c.stop);
-    EXPECT_EQ(encoding(*p), before);
-    EXPECT_EQ(log.entries.size(), c.logged);
-    log.entries.clear();
-  }
 }
 
 }  // namespace

@@ -166,25 +166,6 @@ TEST(KVTestRun, RecordThatCannotBeWrittenCarriesNoLightLevelData) {
   EXPECT_EQ(run->StreamLen(), 4);
 }
 
-TEST(KVTestRun, ReadingFromANegativePositionChangesNothing) {
-  LogCapture log;
-  auto run = run_with(full_record(), u"light");
-  const Bytes before = encoding(*run);
-  Long pos = -1;
-  EXPECT_FALSE(run->StreamIn(stream_of(before), pos));
-  EXPECT_EQ(pos, -1);
-  EXPECT_EQ(encoding(*run), before);
-  EXPECT_TRUE(log.entries.empty());
-
-  // Unreadable streams are refused without touching the object.
-  ByteArray unbounded;
-  pos = 0;
-  EXPECT_FALSE(run->StreamIn(unbounded, pos));
-  pos = kLongMax - 2;
-  EXPECT_FALSE(run->StreamIn(stream_of(before), pos));
-  EXPECT_EQ(encoding(*run), before);
-}
-
 TEST(KVTestRun, IdentityValuesAndRights) {
   auto run = query<KVTestRun>(CreateObject(u"KVData.KVTestRun"));
   EXPECT_EQ(run->ID().type(), VarType::String);

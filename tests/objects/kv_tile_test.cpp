@@ -60,19 +60,5 @@ TEST(KVTile, BandsOutsideOneToFortyAreSilent) {
   EXPECT_EQ(tile->v1Tile().TempComp, tSpectrum{});
 }
 
-TEST(KVTile, ReadingPositionsThatWouldOverflowFail) {
-  auto tile = KVTile::create();
-  tile->ColorRGB(5);
-  constexpr Long kMax = std::numeric_limits<Long>::max();
-
-  // Reading from an array whose last index is the largest Long: the bytes are there,
-  // but Position could not move past the last one, so none is taken.
-  ByteArray top(kMax - 263, kMax);
-  Long position = kMax - 263;
-  EXPECT_FALSE(tile->StreamIn(top, position));
-  EXPECT_EQ(position, kMax - 263);
-  EXPECT_EQ(tile->ColorRGB(), 5);
-}
-
 }  // namespace
 }  // namespace kvdata

@@ -107,32 +107,4 @@ TEST(KVUser, RefusedPositionsLeaveTheirText) {
   EXPECT_EQ(user->ErrMsg(), u"Overflow");
 }
 
-// Short streams, other stamps and Positions outside the stream: bad_input_test.cpp.
-TEST(KVUser, StreamInFromAnotherLowerBound) {
-  ByteArray good;
-  ASSERT_TRUE(sample()->StreamOut(good));
-  auto user = KVUser::create();
-  // A stream loaded from a file starts at index 1. Read from index 0, its
-  // stamp cannot be read at all: one log entry, the stamp counts as 0, and
-  // Position stays.
-  ByteArray from_file(1, 849);
-  for (Long i = 1; i <= 849; ++i) from_file(i) = good(i - 1);
-  {
-    LogCapture log;
-    Long pos = 0;
-    EXPECT_FALSE(user->StreamIn(from_file, pos));
-    EXPECT_EQ(pos, 0);
-    EXPECT_EQ(log.entries.size(), 1u);
-    EXPECT_EQ(user->ErrMsg(), u"Client and Server KVData.DLL versions don't match");
-  }
-  Long pos = 1;
-  EXPECT_TRUE(user->StreamIn(from_file, pos));
-  EXPECT_EQ(pos, 849);
-  EXPECT_EQ(user->v1User().USERID, u"ABCD");
-
-  // An array without bounds fails on asking for them.
-  EXPECT_FALSE(user->StreamIn(ByteArray()));
-  EXPECT_EQ(user->ErrMsg(), u"Subscript out of range");
-}
-
 }  // namespace

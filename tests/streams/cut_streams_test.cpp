@@ -6,8 +6,10 @@
 
 #include <gtest/gtest.h>
 
+#include <cctype>
 #include <fstream>
 #include <functional>
+#include <limits>
 #include <map>
 #include <memory>
 #include <sstream>
@@ -260,18 +262,23 @@ std::map<std::string, Reader> readers() {
   return all;
 }
 
-// A number in a row: N, c (the cut), e (the fingerprint's length) or cB/W
-// (B plus the whole W-byte values between B and the cut).
-std::size_t value_of(const std::string& token, std::size_t cut, std::size_t end) {
+// A number in a row: N, c (the cut, or the starting Position), e (the
+// fingerprint's length), cB/W (B plus the whole W-byte values between B and
+// the cut), min, max or max-N (the Long range).
+long long value_of(const std::string& token, long long cut, std::size_t end) {
+  constexpr long long kMax = std::numeric_limits<Long>::max();
   if (token == "c") return cut;
-  if (token == "e") return end;
+  if (token == "e") return static_cast<long long>(end);
+  if (token == "min") return std::numeric_limits<Long>::min();
+  if (token.rfind("max", 0) == 0)
+    return token.size() == 3 ? kMax : kMax - std::stoll(token.substr(4));
   if (token[0] == 'c') {
     const std::size_t slash = token.find('/');
-    const std::size_t base = std::stoul(token.substr(1, slash - 1));
-    const std::size_t width = std::stoul(token.substr(slash + 1));
+    const long long base = std::stoll(token.substr(1, slash - 1));
+    const long long width = std::stoll(token.substr(slash + 1));
     return cut < base ? base : base + (cut - base) / width * width;
   }
-  return std::stoul(token);
+  return std::stoll(token);
 }
 
 // A state: "old", "new", "new:K" (new up to K, old after it) or slices
@@ -294,8 +301,9 @@ Bytes expected_state(const std::string& state, const Bytes& fresh, const Bytes& 
     }
     const Bytes& from = part.rfind("new", 0) == 0 ? fresh : old;
     const std::size_t dots = part.find("..");
-    const std::size_t a = value_of(part.substr(4, dots - 4), cut, from.size());
-    const std::size_t b = value_of(part.substr(dots + 2, part.size() - dots - 3), cut, from.size());
+    const auto a = value_of(part.substr(4, dots - 4), static_cast<long long>(cut), from.size());
+    const auto b = value_of(part.substr(dots + 2, part.size() - dots - 3),
+                            static_cast<long long>(cut), from.size());
     out.insert(out.end(), from.begin() + static_cast<std::ptrdiff_t>(a),
                from.begin() + static_cast<std::ptrdiff_t>(b));
   }
@@ -341,16 +349,28 @@ TEST(CutStreams, EveryReaderAsListed) {
     // changes the bytes from OFF on.
     std::size_t lo = r.example.size(), hi = lo;
     Bytes changed = r.example;
+    // "at:P", "file:P" and "top:P" read the whole example from Position P,
+    // at index 0, 1 or ending at the top of the Long range; "none" reads an
+    // array without bounds.
+    Long lower = 0;
+    long long start = 0;
+    const std::size_t colon = cuts.find(':');
+    const std::string place = cuts.substr(0, colon);
+    if (colon != std::string::npos) start = value_of(cuts.substr(colon + 1), 0, r.example.size());
+    if (place == "file") lower = 1;
+    if (place == "top")
+      lower = std::numeric_limits<Long>::max() - static_cast<Long>(r.example.size()) + 1;
     if (cuts[0] == '@') {
       std::size_t at = std::stoul(cuts.substr(1), nullptr, 0);
       std::istringstream hex(cuts.substr(cuts.find('=') + 1));
       for (std::string h; std::getline(hex, h, '.');)
         changed.at(at++) = static_cast<Byte>(std::stoul(h, nullptr, 16));
-    } else {
+    } else if (std::isdigit(static_cast<unsigned char>(cuts[0]))) {
       lo = std::stoul(cuts);
       hi = cuts.find('-') == std::string::npos
                ? lo
-               : value_of(cuts.substr(cuts.find('-') + 1), 0, r.example.size() - 1);
+               : static_cast<std::size_t>(
+                     value_of(cuts.substr(cuts.find('-') + 1), 0, r.example.size() - 1));
     }
     const int before = failures();
     for (std::size_t cut = lo; cut <= hi; ++cut) {
@@ -358,15 +378,20 @@ TEST(CutStreams, EveryReaderAsListed) {
       log.entries.clear();
       Long pos = 0;
       std::string err;
-      const ByteArray stream = stream_of(cut < r.example.size() ? prefix(r.example, cut) : changed);
+      const bool cut_short = cut < r.example.size();
+      const ByteArray stream = place == "none"
+                                   ? ByteArray()
+                                   : stream_of(cut_short ? prefix(r.example, cut) : changed, lower);
+      pos = cut_short ? 0 : static_cast<Long>(start);
+      const long long at = cut_short ? static_cast<long long>(cut) : start;
       testing::reset_largest_allocation();
       const Bytes got = r.read(stream, pos, ok, err);
       EXPECT_LT(read_allocation, 2 * r.example.size() + 4096);
       EXPECT_EQ(ok ? "true" : "false", result);
       if (position.rfind("<=", 0) == 0) {
-        EXPECT_LE(pos, static_cast<Long>(value_of(position.substr(2), cut, 0)));
+        EXPECT_LE(pos, value_of(position.substr(2), at, 0));
       } else if (position != "-") {
-        EXPECT_EQ(pos, static_cast<Long>(value_of(position, cut, 0)));
+        EXPECT_EQ(pos, value_of(position, at, 0));
       }
       if (entries == "<=1") {
         EXPECT_LE(log.entries.size(), 1u);
@@ -374,7 +399,7 @@ TEST(CutStreams, EveryReaderAsListed) {
         EXPECT_EQ(log.entries.size(), std::stoul(entries));
       }
       if (state != "-") {
-        ASSERT_EQ(got, expected_state(state, fresh, old, cut));
+        EXPECT_EQ(got, expected_state(state, fresh, old, cut));
       }
       EXPECT_EQ(err, error);
       if (failures() > before) {  // one report a row
