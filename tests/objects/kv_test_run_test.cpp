@@ -80,12 +80,6 @@ tTestRun1 full_record() {
   return r;
 }
 
-// The record as a reader gets it back: the light-level spectra are not carried.
-tTestRun1 decoded(tTestRun1 r) {
-  r.LightLevels.LightLevels = {};
-  return r;
-}
-
 std::shared_ptr<KVTestRun> run_with(const tTestRun1& record, const String& light_level_data) {
   auto run = KVTestRun::create();
   run->v1TestRun(record);
@@ -123,30 +117,6 @@ TEST(KVTestRun, StreamStartsWithTheVersionAndEndsWithTheLightLevelData) {
   ASSERT_EQ(fresh.size(), 519u);
   EXPECT_EQ(prefix(fresh, 4), kStamp14);
   EXPECT_EQ(slice(fresh, 4, 519), Bytes(515, 0));
-}
-
-TEST(KVTestRun, RoundTripIntoAFreshObject) {
-  const tTestRun1 record = full_record();
-  auto run = run_with(record, u"levels: 1 2 3");
-  const Bytes written = encoding(*run);
-
-  ByteArray stream = stream_of({0xEE, 0xEE, 0xEE});
-  Long pos = 3;
-  EXPECT_TRUE(run->StreamOut(stream, pos));
-  EXPECT_EQ(pos, 3 + static_cast<Long>(written.size()));
-
-  auto fresh = KVTestRun::create();
-  Long in = 3;
-  EXPECT_TRUE(fresh->StreamIn(stream, in));
-  EXPECT_EQ(in, pos);
-  EXPECT_EQ(fresh->v1TestRun(), decoded(record));
-  EXPECT_EQ(fresh->v1TestRun().LightLevels.LightLevels(3).Data(7), 0.0f);
-  EXPECT_EQ(encoding(*fresh), written);  // the light-level text came along
-
-  EXPECT_EQ(fresh->ID().type(), VarType::String);
-  EXPECT_EQ(fresh->ID().get<String>(), u"SN-0042");
-  EXPECT_EQ(fresh->DateCreated().type(), VarType::Date);
-  EXPECT_EQ(fresh->DateCreated().get<Date>(), Date{45123.25});
 }
 
 TEST(KVTestRun, RecordThatCannotBeWrittenCarriesNoLightLevelData) {

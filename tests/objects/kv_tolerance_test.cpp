@@ -92,27 +92,22 @@ TEST(KVTolerance, StreamOutRaisesTheFailureWithItsStep) {
   EXPECT_EQ(untouched.ubound(), 9);
 }
 
-TEST(KVTolerance, TextFieldsAreCutPaddedAndTrimmed) {
+// Texts are cut to their width in UTF-16 units (a surrogate pair across the
+// end keeps its high half), trimmed of blanks, and travel as the units they
+// are: CJK, surrogate pairs and lone surrogates, nothing replaced by '?'.
+TEST(KVTolerance, TextFieldsAreCutByUnitsAndCarryAnyUnit) {
   auto tol = KVTolerance::create();
   IKVTolerance& t = *tol;
-  const String sixty(60, u'x');
-  t.TolName(sixty);
-  EXPECT_EQ(t.TolName(), sixty.substr(0, 50));
-  t.TolName(u"  Red  ");
-  EXPECT_EQ(t.TolName(), u"Red");
+  t.TolName(String(49, u'a') + u"\U0001F600");
   t.Description(String(300, u'd'));
-  t.Misc(String(51, u'm'));
-  EXPECT_EQ(t.Misc(), String(50, u'm'));
-  // A text cut to its width does not run into the next field.
-  EXPECT_EQ(t.Description(), String(255, u'd'));
-  EXPECT_EQ(t.TolName(), u"Red");
-
-  // Limits are stored as given, in any order.
-  t.MinFail(9.0);
-  t.MaxFail(-9.0);
-  EXPECT_EQ(t.MinFail(), 9.0);
-  EXPECT_EQ(t.MaxFail(), -9.0);
-  EXPECT_EQ(kvdata::query<IKVStream>(tol)->StreamLen(), 748);
+  t.Misc(String(u"  x\U0001F600") + char16_t{0xDC00} + u"\u65E5  ");
+  ByteArray s(0, -1);
+  ASSERT_TRUE(tol->StreamOut(s));
+  auto back = KVTolerance::create();
+  ASSERT_TRUE(back->StreamIn(s));
+  EXPECT_EQ(back->TolName(), String(49, u'a') + char16_t{0xD83D});
+  EXPECT_EQ(back->Description(), String(255, u'd'));  // not run into the next field
+  EXPECT_EQ(back->Misc(), String(u"x\U0001F600") + char16_t{0xDC00} + u"\u65E5");
 }
 
 }  // namespace

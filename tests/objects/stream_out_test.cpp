@@ -42,6 +42,12 @@ std::shared_ptr<IKVStream> tolerance() {
   t->TolName(u"dE");
   return t;
 }
+std::shared_ptr<IKVStream> tol_set() {
+  auto s = KVTolSet::create();
+  s->Add(query<IKVTolerance>(tolerance()), u"5");
+  s->Add(KVTolerance::create(), u"0");
+  return s;
+}
 std::shared_ptr<IKVStream> tile_set() {
   auto s = KVTileSet::create();
   s->TSN(u"TS-042");
@@ -79,6 +85,7 @@ const std::vector<Case>& cases() {
       // an encoding longer than the working room grows the array past it
       {"test run of 40 tiles", [] { return test_run(40); }, false, false, kLongMax - 19999, false},
       {"tolerance", tolerance, true, true, kLongMax - 100, true, 1},
+      {"tolerance set", tol_set, false, false, kLongMax - 100, false, 3},
       {"user", user, false, false, kLongMax - 847},
       {"tile", tile, false, false, kLongMax - 100},
       {"tile set", tile_set, false, false, kLongMax - 100},
