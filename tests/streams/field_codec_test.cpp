@@ -7,7 +7,6 @@
 #include <vector>
 
 #include "kvdata/kvdata.hpp"
-#include "streams/detail/checked_codec.hpp"
 #include "streams/stream_test_support.hpp"
 
 namespace kvdata {
@@ -306,31 +305,6 @@ TEST(FieldCodec, StringWriterFailures) {
   EXPECT_EQ(log.entries[1],
             u"Calling LongToArray - (StringToArray, VIZuvuvadiRoruzu)\r\n"
             u"Error in SUB StringToArray - Value = abcdefghij. 6-Overflow. (KVData).");
-}
-
-TEST(FieldCodec, CheckedVariantsReportWhatThePublicOnesOnlyLog) {
-  LogCapture log;
-  ByteArray stream(0, -1);
-  Long pos = 0;
-  EXPECT_TRUE(checked::write_string(u"hi", stream, pos));
-  EXPECT_TRUE(checked::write_boolean(true, stream, pos));
-  ByteArray none;
-  Long zero = 0;
-  EXPECT_FALSE(checked::write_single(1.0f, none, zero));
-  EXPECT_EQ(log.entries.size(), 1u);
-
-  pos = 0;
-  String s;
-  bool b = false;
-  Long l = 0;
-  EXPECT_TRUE(checked::read_string(stream, pos, s));
-  EXPECT_TRUE(checked::read_boolean(stream, pos, b));
-  EXPECT_FALSE(checked::read_long(stream, pos, l));
-  s = u"x";
-  EXPECT_FALSE(checked::read_string(stream, pos, s));  // no count left
-  EXPECT_EQ(s, u"");
-  EXPECT_EQ(log.entries.size(), 3u);
-  EXPECT_EQ(pos, 7);
 }
 
 }  // namespace
