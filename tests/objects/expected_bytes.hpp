@@ -6,6 +6,7 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cstddef>
 #include <fstream>
 #include <sstream>
@@ -34,6 +35,7 @@ inline std::vector<kvdata::Byte> ImageFromData(const std::string& section) {
         all.insert(all.end(), word.begin(), word.end());
       } else if (t == "text" && tokens >> word >> n) {
         if (word == "-") word.clear();
+        std::replace(word.begin(), word.end(), '_', ' ');
         for (std::size_t i = 0; i < n; ++i) {
           all.push_back(i < word.size() ? static_cast<kvdata::Byte>(word[i]) : kvdata::Byte{0x20});
           all.push_back(0);

@@ -64,30 +64,6 @@ TEST(KVCalibration, TsnIsEightUnitsCutOrPadded) {
   EXPECT_EQ(cal->TSN(), u"AB      ");  // the get above trims a copy only
 }
 
-TEST(KVCalibration, BlockLayout) {
-  auto cal = KVCalibration::create();
-  cal->TSN(u"AB");
-  cal->DateCertified(Date{45000.5});
-  cal->TempCalibrated(23.5f);
-  cal->Tiles(1)->SCWL(eSC::SCE, 1, 1.0);
-  cal->Tiles(13)->SCWL(eSC::SCI, 40, 87.5);
-  cal->Tiles(2)->SCWL(eSC::SCI, 1, -2.5);
-
-  const ByteArray bytes = block_of(*cal);
-  EXPECT_EQ(slice(bytes, 0, 32), cat({
-                                     {0x41, 0x00, 0x42, 0x00},                          // "AB"
-                                     units(0x20, 0x00, 6),                              // padding
-                                     {0x00, 0x00, 0x00, 0x00, 0x10, 0xF9, 0xE5, 0x40},  // date
-                                     {0x00, 0x00, 0xBC, 0x41},                          // 23.5
-                                     {0x00, 0x00, 0x80, 0x3F},  // tile 1 SCE band 1
-                                 }));
-  // Tile 2 SCI band 1 at 28 + 320 + 160.
-  EXPECT_EQ(slice(bytes, 504, 8), (Bytes{0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0x20, 0xC0}));
-  // Tile 13 SCI band 40 at 28 + 320 x 12 + 160 + 39 x 4, the block's last value.
-  EXPECT_EQ(slice(bytes, 4180, 9), (Bytes{0, 0, 0, 0, 0x00, 0x00, 0xAF, 0x42, 0}));
-  EXPECT_EQ(cal->DateCreated().get<Date>(), Date{45000.5});
-}
-
 TEST(KVCalibration, TilesAreWrittenBackAtTheirOrder) {
   auto cal = KVCalibration::create();
   cal->v1Calibration(filled_record());

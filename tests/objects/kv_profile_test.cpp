@@ -73,22 +73,6 @@ std::shared_ptr<KVProfile> source_profile() {
   return p;
 }
 
-TEST(KVProfile, NewProfileStreamIsTheLiteral1649Bytes) {
-  auto p = KVProfile::create();
-  const Bytes expected = new_profile_stream();
-  ASSERT_EQ(expected.size(), 1649u);
-
-  ByteArray stream;  // never given bounds: the writer creates it from index 0
-  Long pos = 0;
-  EXPECT_TRUE(p->StreamOut(stream, pos));
-  EXPECT_EQ(pos, 1649);
-  EXPECT_EQ(stream.lbound(), 0);
-  EXPECT_EQ(stream.ubound(), 1649);  // one spare byte after the encoding
-  EXPECT_EQ(prefix(contents(stream), 1649), expected);
-  EXPECT_EQ(stream(1649), 0);
-  EXPECT_EQ(p->StreamLen(), 1649);
-}
-
 TEST(KVProfile, CorrectionsLandAtTheirPlacesAndComeBack) {
   auto p = KVProfile::create();
   p->WhiteCorrection(kSCI, 40, 2.5f);       // wCal(1) band 40: the 317th group of four

@@ -54,31 +54,6 @@ std::shared_ptr<KVTolSet> two_member_set() {
   return set;
 }
 
-TEST(KVTolSet, StreamIsTheHeaderThenEachMember) {
-  const std::vector<kvdata::Byte> image = ImageFromData("tolerance set");
-  ASSERT_EQ(image.size(), 2031u);
-
-  auto set = two_member_set();
-  ByteArray bytes(0, -1);
-  Long pos = 0;
-  ASSERT_TRUE(set->StreamOut(bytes, pos));
-  EXPECT_EQ(pos, 2031);
-  EXPECT_EQ(bytes.lbound(), 0);
-  EXPECT_EQ(bytes.ubound(), 2031);
-  EXPECT_TRUE(HoldsAt(bytes, 0, image));
-  EXPECT_EQ(set->StreamLen(), 532 + 2 * 748);
-
-  // An empty set: the header alone, one spare element after it.
-  auto empty = KVTolSet::create();
-  ByteArray alone;
-  pos = 0;
-  ASSERT_TRUE(empty->StreamOut(alone, pos));
-  EXPECT_EQ(pos, 533);
-  EXPECT_EQ(alone.ubound(), 533);
-  EXPECT_TRUE(HoldsAt(alone, 528, {0x00, 0x00, 0x00, 0x00, 0x00, 0x00}));
-  EXPECT_EQ(empty->StreamLen(), 532);
-}
-
 TEST(KVTolSet, ItemLooksUpTextKeysNeverPositions) {
   auto set = two_member_set();
   IKVTolSet& s = *set;

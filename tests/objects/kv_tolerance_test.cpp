@@ -5,7 +5,6 @@
 #include <limits>
 
 #include "kvdata/automation/error.hpp"
-#include "objects/expected_bytes.hpp"
 
 namespace {
 
@@ -27,39 +26,6 @@ std::shared_ptr<KVTolerance> sample_tolerance() {
   tol->MaxFail(2.0);
   tol->Misc(u"");
   return tol;
-}
-
-// The 749 bytes of sample_tolerance().
-std::vector<kvdata::Byte> sample_image() {
-  return ImageFromData("tolerance");
-}
-
-TEST(KVTolerance, StreamImageIsTheRecordAndOneTrailingByte) {
-  const auto expected = sample_image();
-  ASSERT_EQ(expected.size(), 749u);
-
-  ByteArray bytes(0, -1);
-  Long pos = 0;
-  ASSERT_TRUE(sample_tolerance()->StreamOut(bytes, pos));
-  EXPECT_EQ(pos, 749);
-  EXPECT_EQ(bytes.lbound(), 0);
-  EXPECT_EQ(bytes.ubound(), 749);  // one element beyond the image
-  EXPECT_TRUE(HoldsAt(bytes, 0, expected));
-  EXPECT_EQ(bytes(749), 0);
-
-  auto back = KVTolerance::create();
-  pos = 0;
-  ASSERT_TRUE(back->StreamIn(bytes, pos));
-  EXPECT_EQ(pos, 749);
-  EXPECT_EQ(back->MinFail(), -1.5);  // every field comes back: it is written out again the same
-  ByteArray again(0, -1);
-  ASSERT_TRUE(back->StreamOut(again));
-  EXPECT_EQ(again, bytes);
-
-  // A new tolerance streams a zero-filled record: its texts were never set.
-  ByteArray fresh;
-  ASSERT_TRUE(KVTolerance::create()->StreamOut(fresh));
-  EXPECT_TRUE(HoldsAt(fresh, 0, std::vector<kvdata::Byte>(750, 0)));
 }
 
 TEST(KVTolerance, StreamOutRaisesTheFailureWithItsStep) {
