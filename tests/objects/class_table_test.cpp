@@ -5,7 +5,6 @@
 #include <string_view>
 #include <typeindex>
 #include <typeinfo>
-#include <vector>
 
 #include "kvdata/kvdata.hpp"
 #include "support/error_number.hpp"

@@ -11,12 +11,7 @@
 namespace kvdata {
 namespace {
 
-using testing::Bytes;
-using testing::cat;
 using testing::error_number;
-using testing::slice;
-using testing::stream_of;
-using testing::units;
 
 // An IKVCalTile that is not a KVCalTile.
 class ForeignCalTile : public IKVCalTile {

@@ -2,13 +2,10 @@
 
 #include <gtest/gtest.h>
 
-#include <algorithm>
 #include <cstddef>
 #include <initializer_list>
-#include <iterator>
 #include <limits>
 #include <memory>
-#include <vector>
 
 #include "kvdata/kvdata.hpp"
 #include "objects/expected_bytes.hpp"
@@ -19,10 +16,8 @@ namespace kvdata {
 namespace {
 
 using testing::Bytes;
-using testing::contents;
 using testing::encoding;
 using testing::error_number;
-using testing::LogCapture;
 using testing::prefix;
 using testing::stream_of;
 using testing::Wire;

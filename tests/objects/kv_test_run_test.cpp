@@ -2,7 +2,6 @@
 
 #include <gtest/gtest.h>
 
-#include <algorithm>
 #include <cstddef>
 #include <limits>
 #include <memory>
@@ -15,10 +14,7 @@ namespace {
 
 using testing::Bytes;
 using testing::contents;
-using testing::encoding;
-using testing::LogCapture;
 using testing::prefix;
-using testing::stream_of;
 using testing::Wire;
 
 constexpr Long kLongMax = std::numeric_limits<Long>::max();

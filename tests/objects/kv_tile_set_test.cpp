@@ -176,12 +176,6 @@ TEST(KVTileSet, StreamInReadsTsnAndOneBlockPerElement) {
     std::size_t logged;
     Check check;  // nothing: the record is unchanged
   } cases[] = {
-      {"1 to 13", true, 1, 13, tile_set_stream(13), true, 7 + 13 * 264, 0,
-       [](const tTileSet& r) {
-         EXPECT_EQ(r.TSN, u"TS1");
-         EXPECT_EQ(r.Tiles(1).Name, u"A");
-         EXPECT_EQ(r.Tiles(13), tile_def(u"M", 13, 0.0f));
-       }},
       {"1 to 3: exactly three blocks", true, 1, 3, tile_set_stream(13), true, 7 + 3 * 264, 0,
        [](const tTileSet& r) { EXPECT_EQ(r.Tiles(3).Name, u"C"); }},
       {"0 to 14: elements 0 and 14 not stored", true, 0, 14, tile_set_stream(15), true,

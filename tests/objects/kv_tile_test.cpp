@@ -2,21 +2,13 @@
 
 #include <gtest/gtest.h>
 
-#include <cmath>
-#include <limits>
-
 #include "support/error_number.hpp"
 #include "support/streams.hpp"
 
 namespace kvdata {
 namespace {
 
-using testing::Bytes;
-using testing::cat;
 using testing::error_number;
-using testing::slice;
-using testing::stream_of;
-using testing::units;
 
 TEST(KVTile, BandsOutsideOneToFortyAreSilent) {
   auto tile = KVTile::create();

@@ -2,22 +2,17 @@
 
 #include <gtest/gtest.h>
 
-#include <limits>
 #include <vector>
 
 #include "kvdata/automation/create_object.hpp"
 #include "kvdata/automation/error.hpp"
-#include "objects/expected_bytes.hpp"
 
 namespace {
 
 using kvdata::ByteArray;
 using kvdata::Date;
 using kvdata::Double;
-using kvdata::IKVDBObject;
 using kvdata::IKVObj;
-using kvdata::IKVSecurity;
-using kvdata::IKVStream;
 using kvdata::IKVTolerance;
 using kvdata::IKVTolSet;
 using kvdata::KVTolerance;

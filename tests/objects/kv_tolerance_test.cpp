@@ -9,7 +9,6 @@
 namespace {
 
 using kvdata::ByteArray;
-using kvdata::IKVStream;
 using kvdata::IKVTolerance;
 using kvdata::KVTolerance;
 using kvdata::Long;

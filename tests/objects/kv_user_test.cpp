@@ -3,13 +3,7 @@
 #include <gtest/gtest.h>
 
 #include <limits>
-#include <vector>
 
-#include "kvdata/automation/create_object.hpp"
-#include "kvdata/automation/event_log.hpp"
-#include "kvdata/foundation/ikv_db_object.hpp"
-#include "kvdata/foundation/ikv_security.hpp"
-#include "objects/expected_bytes.hpp"
 #include "support/streams.hpp"
 
 namespace {

@@ -4,10 +4,7 @@
 
 #include <gtest/gtest.h>
 
-#include <cstdint>
 #include <functional>
-#include <limits>
-#include <string>
 #include <vector>
 
 #include "kvdata/kvdata.hpp"
@@ -16,12 +13,10 @@
 namespace kvdata {
 namespace {
 
-using testing::contents;
 using testing::LogCapture;
 using testing::organization;
 using testing::profile;
 using testing::sc_pair;
-using testing::spectrum;
 using testing::stream_of;
 using testing::user;
 using testing::Wire;

@@ -1,6 +1,5 @@
 #include <gtest/gtest.h>
 
-#include <string>
 #include <vector>
 
 #include "kvdata/kvdata.hpp"
@@ -13,7 +12,6 @@ namespace {
 using testing::contents;
 using testing::LogCapture;
 using testing::organization;
-using testing::stream_of;
 using testing::user;
 using Bytes = std::vector<Byte>;
 

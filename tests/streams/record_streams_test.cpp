@@ -1,6 +1,5 @@
 #include <gtest/gtest.h>
 
-#include <string>
 #include <vector>
 
 #include "kvdata/kvdata.hpp"
@@ -25,13 +24,6 @@ constexpr auto kFrom = eStreamDirection::FromStream;
 
 Streams& streams() {
   return Streams::instance();
-}
-
-TEST(Streams, IsCreatableAndHasOnePredeclaredInstance) {
-  auto created = query<Streams>(CreateObject(u"KVData.Streams"));
-  ASSERT_NE(created, nullptr);
-  EXPECT_NE(created.get(), &Streams::instance());
-  EXPECT_EQ(&Streams::instance(), &Streams::instance());
 }
 
 TEST(Streams, AnyOtherDirectionDoesNothing) {

@@ -13,7 +13,6 @@ using testing::LogCapture;
 using testing::put;
 using testing::sc_pair;
 using testing::spectrum;
-using testing::stream_of;
 using testing::Wire;
 using Bytes = std::vector<Byte>;
 
