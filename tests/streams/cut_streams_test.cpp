@@ -68,16 +68,17 @@ Reader record(bool (Streams::*fn)(const eStreamDirection&, ByteArray&, Long&, R&
 }
 
 // An object's stream: the array StreamOut fills, its spare byte included.
+// `make(false)` is the sample, `make(true)` the old object.
 template <class T>
-Reader object(std::function<std::shared_ptr<T>()> sample, std::function<std::shared_ptr<T>()> old,
+Reader object(std::function<std::shared_ptr<T>(bool old)> make,
               std::function<Bytes(T&)> fingerprint = nullptr) {
   if (!fingerprint) fingerprint = [](T& o) { return testing::encoding(o); };
   ByteArray image;
   Long length = 0;
-  EXPECT_TRUE(sample()->StreamOut(image, length));
-  return {contents(image), fingerprint(*old()), length,
+  EXPECT_TRUE(make(false)->StreamOut(image, length));
+  return {contents(image), fingerprint(*make(true)), length,
           [=](const ByteArray& s, Long& p, bool& ok, std::string& error) {
-            auto o = old();
+            auto o = make(true);
             ok = o->StreamIn(s, p);
             read_allocation = testing::largest_allocation();
             if constexpr (std::is_same_v<T, KVUser>) error = to_utf8(o->ErrMsg());
@@ -115,80 +116,11 @@ tTestRun1 test_run(const String& isn, float base, Long tiles) {
   return tr;
 }
 
-std::shared_ptr<KVTestRun> run_object(const String& isn, float base, const String& light) {
-  auto run = KVTestRun::create();
-  run->v1TestRun(test_run(isn, base, 1));
-  run->LightLevelData(light);
-  return run;
-}
-
-std::shared_ptr<KVProfile> profile_object(const String& isn, float base) {
-  auto p = KVProfile::create();
-  p->ISN(isn);
-  p->Created(Date{base});
-  p->Validated(base > 1);
-  p->StartWL(static_cast<Long>(base) + 1);
-  p->EndWl(static_cast<Long>(base) + 2);
-  p->Interval(static_cast<Long>(base) + 3);
-  for (Long k = 0; k <= 1; ++k) {
-    for (Long band = 1; band <= 40; ++band) {
-      const auto sc = static_cast<eSC>(k);
-      const float v = base + static_cast<float>(k * 100 + band);
-      p->WhiteCorrection(sc, band, v + 1);
-      p->WaveCorrection(sc, band, v + 2);
-      p->LinearCorrection(sc, band, v + 3);
-      p->DarkCorrection(sc, band, v + 4);
-      p->BandWidthCorrection(sc, band, v + 5);
-    }
-  }
-  return p;
-}
-
-std::shared_ptr<KVTolSet> tol_set(Long id, const std::vector<Long>& members) {
-  auto set = KVTolSet::create();
-  set->ID(id);
-  set->InstTypeID(id + 1);
-  for (const Long m : members) {
-    auto tol = KVTolerance::create();
-    tol->ID(m);
-    tol->TolName(u"T" + Variant(m).to_string());
-    set->Add(tol, Variant(m).to_string());
-  }
-  return set;
-}
-
-std::shared_ptr<KVTileSet> tile_set_object(const String& tsn) {
-  auto set = KVTileSet::create();
-  set->v1TileSet(tile_set(13, tsn));
-  return set;
-}
-
-std::shared_ptr<KVCalibration> calibration_object(const String& tsn) {
-  auto cal = KVCalibration::create();
-  cal->v1Calibration(calibration(13, tsn));
-  return cal;
-}
-
-std::shared_ptr<KVTile> tile_object(Long rgb) {
-  auto tile = KVTile::create();
-  tile->v1Tile(
-      tTileDef{u"Tile" + Variant(rgb).to_string(), rgb, spectrum(static_cast<float>(rgb))});
-  return tile;
-}
-
-std::shared_ptr<KVTolerance> tolerance_object(Long id) {
-  auto tol = KVTolerance::create();
-  tol->ID(id);
-  tol->TolName(u"Tol" + Variant(id).to_string());
-  tol->MinFail(-static_cast<double>(id));
-  tol->MaxFail(static_cast<double>(id));
-  return tol;
-}
-
-std::shared_ptr<KVUser> user_object(const String& id) {
-  auto user = KVUser::create();
-  user->v1User(tUser{id, 12, u"Smith", id, u"pw", u"a@b.c", 3, u"A", u"N"});
-  return user;
+template <class T, class R>
+std::shared_ptr<T> with(void (T::*set)(const R&), const R& record) {
+  auto o = T::create();
+  ((*o).*set)(record);
+  return o;
 }
 
 std::map<std::string, Reader> readers() {
@@ -229,32 +161,75 @@ std::map<std::string, Reader> readers() {
   }
   all["test-run"] =
       record(&Streams::Stream_TestRun, test_run(u"ISN-1", 100, 1), test_run(u"OLD", 7, 2));
-  all["KVUser"] =
-      object<KVUser>([] { return user_object(u"ANN"); }, [] { return user_object(u"OLD"); });
-  all["KVTolerance"] =
-      object<KVTolerance>([] { return tolerance_object(5); }, [] { return tolerance_object(77); });
+  all["KVUser"] = object<KVUser>([](bool old) {
+    const String id = old ? u"OLD" : u"ANN";
+    return with(&KVUser::v1User, tUser{id, 12, u"Smith", id, u"pw", u"a@b.c", 3, u"A", u"N"});
+  });
+  all["KVTolerance"] = object<KVTolerance>([](bool old) {
+    auto tol = KVTolerance::create();
+    tol->ID(old ? 77 : 5);
+    tol->TolName(old ? u"Tol77" : u"Tol5");
+    tol->MaxFail(old ? 77.0 : 5.0);
+    return tol;
+  });
   // The count field (528..531) is left out: members are counted as they come.
   all["KVTolSet"] = object<KVTolSet>(
-      [] {
-        return tol_set(7, {5, 9});
+      [](bool old) {
+        auto set = KVTolSet::create();
+        set->ID(old ? 98 : 7);
+        set->InstTypeID(old ? 99 : 8);
+        for (const Long m : old ? std::vector<Long>{1} : std::vector<Long>{5, 9}) {
+          auto tol = KVTolerance::create();
+          tol->ID(m);
+          tol->TolName(u"T" + Variant(m).to_string());
+          set->Add(tol, Variant(m).to_string());
+        }
+        return set;
       },
-      [] { return tol_set(98, {1}); },
       [](KVTolSet& s) {
         Bytes b = testing::encoding(s);
         std::fill(b.begin() + 528, b.begin() + 532, Byte{0});
         return b;
       });
-  all["KVTile"] = object<KVTile>([] { return tile_object(5); }, [] { return tile_object(9); });
-  all["KVCalibration"] = object<KVCalibration>([] { return calibration_object(u"TS01"); },
-                                               [] { return calibration_object(u"OLD1"); });
-  all["KVTileSet"] = object<KVTileSet>([] { return tile_set_object(u"TS01"); },
-                                       [] { return tile_set_object(u"OLD1"); });
-  all["KVProfile"] = object<KVProfile>([] { return profile_object(u"SN-7", 45000.5f); },
-                                       [] { return profile_object(u"OLD7", 1.0f); });
+  all["KVTile"] = object<KVTile>([](bool old) {
+    return with(&KVTile::v1Tile,
+                tTileDef{old ? u"Tile9" : u"Tile5", old ? 9 : 5, spectrum(old ? 9 : 5)});
+  });
+  all["KVCalibration"] = object<KVCalibration>([](bool old) {
+    return with(&KVCalibration::v1Calibration, calibration(13, old ? u"OLD1" : u"TS01"));
+  });
+  all["KVTileSet"] = object<KVTileSet>(
+      [](bool old) { return with(&KVTileSet::v1TileSet, tile_set(13, old ? u"OLD1" : u"TS01")); });
+  all["KVProfile"] = object<KVProfile>([](bool old) {
+    const float base = old ? 1.0f : 45000.5f;
+    auto p = KVProfile::create();
+    p->ISN(old ? u"OLD7" : u"SN-7");
+    p->Created(Date{base});
+    p->Validated(!old);
+    p->StartWL(static_cast<Long>(base) + 1);
+    p->EndWl(static_cast<Long>(base) + 2);
+    p->Interval(static_cast<Long>(base) + 3);
+    for (Long k = 0; k <= 1; ++k) {
+      for (Long band = 1; band <= 40; ++band) {
+        const auto sc = static_cast<eSC>(k);
+        const float v = base + static_cast<float>(k * 100 + band);
+        p->WhiteCorrection(sc, band, v + 1);
+        p->WaveCorrection(sc, band, v + 2);
+        p->LinearCorrection(sc, band, v + 3);
+        p->DarkCorrection(sc, band, v + 4);
+        p->BandWidthCorrection(sc, band, v + 5);
+      }
+    }
+    return p;
+  });
   {
     // Stamp 1.2: the version read is the one written next.
-    Reader run = object<KVTestRun>([] { return run_object(u"SN-42", 100, u"light"); },
-                                   [] { return run_object(u"OLD01", 7, u"old-text"); });
+    Reader run = object<KVTestRun>([](bool old) {
+      auto r =
+          with(&KVTestRun::v1TestRun, old ? test_run(u"OLD01", 7, 1) : test_run(u"SN-42", 100, 1));
+      r->LightLevelData(old ? u"old-text" : u"light");
+      return r;
+    });
     const Bytes stamp12 = {0x9A, 0x99, 0x99, 0x3F};
     std::copy(stamp12.begin(), stamp12.end(), run.example.begin());
     all["KVTestRun"] = run;

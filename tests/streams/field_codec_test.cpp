@@ -85,19 +85,6 @@ TEST(FieldCodec, EachTypeWritesAndReadsItsLittleEndianImage) {
   EXPECT_TRUE(log.entries.empty());
 }
 
-TEST(FieldCodec, OnlyTheByteOneReadsAsTrue) {
-  const ByteArray stream = stream_of({0x00, 0x01, 0x02, 0xFF, 0x80});
-  Long pos = 0;
-  std::vector<bool> seen;
-  for (int k = 0; k < 5; ++k) {
-    bool b = true;
-    BooleanFromArray(stream, pos, b);
-    seen.push_back(b);
-  }
-  EXPECT_EQ(seen, (std::vector<bool>{false, true, false, false, false}));
-  EXPECT_EQ(pos, 5);
-}
-
 TEST(FieldCodec, WritersGrowToTheExactEndAndKeepTheLowerBound) {
   LogCapture log;
   ByteArray gap = stream_of({0xAA, 0xBB, 0xCC, 0xDD});
