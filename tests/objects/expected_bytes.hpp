@@ -53,21 +53,3 @@ inline std::vector<kvdata::Byte> ImageFromData(const std::string& section) {
   EXPECT_FALSE(all.empty()) << "no image [" << section << "]";
   return all;
 }
-
-// Compares the elements at indices from .. from + expected.size() - 1,
-// reporting the first index that differs.
-inline ::testing::AssertionResult HoldsAt(const kvdata::ByteArray& stream, kvdata::Long from,
-                                          const std::vector<kvdata::Byte>& expected) {
-  for (std::size_t i = 0; i < expected.size(); ++i) {
-    const kvdata::Long index = from + static_cast<kvdata::Long>(i);
-    if (!stream.contains(index)) {
-      return ::testing::AssertionFailure() << "index " << index << " outside the stream";
-    }
-    if (stream(index) != expected[i]) {
-      return ::testing::AssertionFailure()
-             << "index " << index << " (offset " << i << ") holds " << int{stream(index)}
-             << ", expected " << int{expected[i]};
-    }
-  }
-  return ::testing::AssertionSuccess();
-}

@@ -40,15 +40,14 @@ TEST(KVTestRun, StreamStartsWithTheVersionAndEndsWithTheLightLevelData) {
   record.UserNumber = 7;
   auto run = run_with(record, u"L1");
 
+  // The record as its own stream writes it (its layout: test_run_stream_test.cpp).
+  ByteArray record_stream(0, -1);
+  Long end = 0;
+  ASSERT_TRUE(
+      Streams::instance().Stream_TestRun(eStreamDirection::ToStream, record_stream, end, record));
   Wire w;
   w.raw({0x33, 0x33, 0xB3, 0x3F});
-  w.raw({0x03, 0x00, 0x00, 0x00, 'S', 'N', '1'}).raw({0x07, 0x00, 0x00, 0x00});
-  w.zeros(4 + 8 + 4);            // StationGUID, TestDate, Comment
-  w.zeros(4 * (4 + 4 + 8 + 8));  // four test statistics
-  w.zeros(2 * (160 + 12));       // blue and white tile
-  w.zeros(4 + 4 + 8 + 8);        // IIA statistics
-  w.zeros(8 + 4 + 1);            // CalStandard, TSN, Has2Measurement
-  w.zeros(8 + 2);                // one series: Profile, no tiles
+  w.bytes.insert(w.bytes.end(), record_stream.begin(), record_stream.end());
   w.raw({0x02, 0x00, 0x00, 0x00, 'L', '1'});
   ASSERT_EQ(w.bytes.size(), 524u);
 

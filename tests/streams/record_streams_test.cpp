@@ -85,16 +85,6 @@ TEST(Streams, SCPairWriterGrowsTheStreamAsItsValuesOneByOneWould) {
   want.insert(want.end(), expected.bytes.begin(), expected.bytes.end());
   EXPECT_EQ(contents(loaded), want);
   EXPECT_TRUE(log.entries.empty());
-
-  // A Position below the lower bound: the first value fails, logs its one
-  // entry, and nothing is written.
-  pos = 0;
-  EXPECT_FALSE(streams().Stream_SCPair(kTo, loaded, pos, copy));
-  EXPECT_EQ(pos, 0);
-  EXPECT_EQ(contents(loaded), want);
-  ASSERT_EQ(log.entries.size(), 1u);
-  EXPECT_EQ(log.entries[0].rfind(u"Error in SUB SingleToArray - Value = 3.25. 9-", 0), 0u)
-      << to_utf8(log.entries[0]);
 }
 
 TEST(Streams, StationIsThreeStrings) {
