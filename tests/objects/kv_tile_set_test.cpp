@@ -262,5 +262,15 @@ TEST(KVTileSet, TilesKeepTheirSetAlive) {
   EXPECT_TRUE(watch.expired());
 }
 
+TEST(KVTile, BandsOutsideOneToFortyAreSilent) {
+  auto tile = KVTile::create();
+  tile->TempCompWL(0, 5.0);
+  tile->TempCompWL(41, 5.0);
+  tile->TempCompWL(-1, 5.0);
+  EXPECT_EQ(tile->TempCompWL(0), 0.0);
+  EXPECT_EQ(tile->TempCompWL(41), 0.0);
+  EXPECT_EQ(tile->v1Tile().TempComp, tSpectrum{});
+}
+
 }  // namespace
 }  // namespace kvdata

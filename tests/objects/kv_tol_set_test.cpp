@@ -7,19 +7,8 @@
 #include "kvdata/automation/create_object.hpp"
 #include "kvdata/automation/error.hpp"
 
+namespace kvdata {
 namespace {
-
-using kvdata::ByteArray;
-using kvdata::Date;
-using kvdata::Double;
-using kvdata::IKVObj;
-using kvdata::IKVTolerance;
-using kvdata::IKVTolSet;
-using kvdata::KVTolerance;
-using kvdata::KVTolSet;
-using kvdata::Long;
-using kvdata::String;
-using kvdata::Variant;
 
 std::shared_ptr<KVTolerance> tolerance(Long id, const String& name = {}) {
   auto tol = KVTolerance::create();
@@ -151,3 +140,4 @@ TEST(KVTolSet, IdentityIsTheInstrumentType) {
 }
 
 }  // namespace
+}  // namespace kvdata

@@ -6,13 +6,8 @@
 
 #include "kvdata/automation/error.hpp"
 
+namespace kvdata {
 namespace {
-
-using kvdata::ByteArray;
-using kvdata::IKVTolerance;
-using kvdata::KVTolerance;
-using kvdata::Long;
-using kvdata::String;
 
 std::shared_ptr<KVTolerance> sample_tolerance() {
   auto tol = KVTolerance::create();
@@ -76,3 +71,4 @@ TEST(KVTolerance, TextFieldsAreCutByUnitsAndCarryAnyUnit) {
 }
 
 }  // namespace
+}  // namespace kvdata

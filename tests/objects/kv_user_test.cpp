@@ -6,13 +6,8 @@
 
 #include "support/streams.hpp"
 
+namespace kvdata {
 namespace {
-
-using kvdata::ByteArray;
-using kvdata::KVUser;
-using kvdata::Long;
-using kvdata::String;
-using kvdata::tUser;
 
 tUser sample_user() {
   tUser u;
@@ -90,3 +85,4 @@ TEST(KVUser, RefusedPositionsLeaveTheirText) {
 }
 
 }  // namespace
+}  // namespace kvdata

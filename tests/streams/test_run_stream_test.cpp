@@ -131,23 +131,6 @@ TEST(TestRunStream, OneOrTwoSeriesInStreamOrder) {
   }
 }
 
-TEST(TestRunStream, SeriesWithoutTilesTravelAsCountZero) {
-  // A new test run has no tiles in either series; it is written and read back.
-  tTestRun1 fresh;
-  fresh.IIA.Has2Measurement = true;
-  ByteArray stream(0, -1);
-  Long pos = 0;
-  ASSERT_TRUE(streams().Stream_TestRun(kTo, stream, pos, fresh));
-  const Bytes bytes = contents(stream);
-  // ... Has2Measurement, then (Profile 0, count 0) twice.
-  EXPECT_EQ(Bytes(bytes.end() - 21, bytes.end()),
-            (Bytes{0x01, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0}));
-  tTestRun1 back = test_run(true);
-  pos = 0;
-  ASSERT_TRUE(streams().Stream_TestRun(kFrom, stream, pos, back));
-  EXPECT_EQ(back, fresh);
-}
-
 TEST(TestRunStream, WriterRefusesSeriesBeyondTheSixteenBitCounter) {
   LogCapture log;
   ByteArray stream(0, -1);
