@@ -133,6 +133,16 @@ TEST(ClassTable, InterfacesIdentityAndInertPersistenceAndRights) {
   }
 }
 
+TEST(ClassTable, TestRunTilesDECalculatesNothingAndKeepsItsArguments) {
+  auto des = query<KVTestRunTilesDE>(CreateObject(u"KVData.KVTestRunTilesDE"));
+  String isn = u"SN-1";
+  Date date{45000.5};
+  EXPECT_FALSE(des->FetchAndCalculateDEs(isn, date));
+  EXPECT_EQ(isn, u"SN-1");
+  EXPECT_EQ(date, Date{45000.5});
+  EXPECT_EQ(des->ID(), Variant(Long{0}));  // a Long 0, not Empty
+}
+
 TEST(ClassTable, InterfacesFacadesAndOtherNamesCannotBeCreated) {
   for (std::u16string_view name :
        {u"IKVObj",         u"IKVStream",  u"IKVDBObject",  u"IKVSecurity",   u"IKVObjCreator",
