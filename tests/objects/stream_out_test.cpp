@@ -24,7 +24,7 @@ constexpr Long kLongMin = std::numeric_limits<Long>::min();
 
 std::shared_ptr<IKVStream> profile() {
   auto p = KVProfile::create();
-  p->ISN(u"SN-7");
+  p->ISN(u"SN-\u20AC");  // one byte in the stream
   return p;
 }
 std::shared_ptr<IKVStream> test_run(Long tiles) {
