@@ -27,16 +27,6 @@ TEST(DBManager, FacadesAreCreatedOncePerManager) {
   check(&DBManager::DBUsers);
   check(&DBManager::DBTestRuns);
   check(&DBManager::DBServerDB);
-
-  // A facade reached through the manager is inert: a filled record stays as it was.
-  tUser user;
-  user.USERID = u"jdoe";
-  user.UserNumber = 42;
-  user.OrgID = 12;
-  user.Disabled = u"N";
-  const tUser before = user;
-  EXPECT_FALSE(first->DBUsers()->Retrieve(Long{42}, user));
-  EXPECT_EQ(user, before);
 }
 
 TEST(DBManager, TolSetWordGivesTheOneSharedSet) {

@@ -6,6 +6,7 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cstddef>
 #include <fstream>
 #include <sstream>
@@ -34,6 +35,7 @@ inline std::vector<kvdata::Byte> ImageFromData(const std::string& section) {
         all.insert(all.end(), word.begin(), word.end());
       } else if (t == "text" && tokens >> word >> n) {
         if (word == "-") word.clear();
+        std::replace(word.begin(), word.end(), '_', ' ');
         for (std::size_t i = 0; i < n; ++i) {
           all.push_back(i < word.size() ? static_cast<kvdata::Byte>(word[i]) : kvdata::Byte{0x20});
           all.push_back(0);
@@ -50,22 +52,4 @@ inline std::vector<kvdata::Byte> ImageFromData(const std::string& section) {
   }
   EXPECT_FALSE(all.empty()) << "no image [" << section << "]";
   return all;
-}
-
-// Compares the elements at indices from .. from + expected.size() - 1,
-// reporting the first index that differs.
-inline ::testing::AssertionResult HoldsAt(const kvdata::ByteArray& stream, kvdata::Long from,
-                                          const std::vector<kvdata::Byte>& expected) {
-  for (std::size_t i = 0; i < expected.size(); ++i) {
-    const kvdata::Long index = from + static_cast<kvdata::Long>(i);
-    if (!stream.contains(index)) {
-      return ::testing::AssertionFailure() << "index " << index << " outside the stream";
-    }
-    if (stream(index) != expected[i]) {
-      return ::testing::AssertionFailure()
-             << "index " << index << " (offset " << i << ") holds " << int{stream(index)}
-             << ", expected " << int{expected[i]};
-    }
-  }
-  return ::testing::AssertionSuccess();
 }

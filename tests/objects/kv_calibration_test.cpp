@@ -11,12 +11,7 @@
 namespace kvdata {
 namespace {
 
-using testing::Bytes;
-using testing::cat;
 using testing::error_number;
-using testing::slice;
-using testing::stream_of;
-using testing::units;
 
 // An IKVCalTile that is not a KVCalTile.
 class ForeignCalTile : public IKVCalTile {
@@ -53,19 +48,6 @@ ByteArray block_of(KVCalibration& cal) {
   return bytes;
 }
 
-TEST(KVCalibration, NewCalibrationIsAllZero) {
-  auto cal = KVCalibration::create();
-  EXPECT_EQ(cal->TSN(), String(8, u'\0'));
-  EXPECT_EQ(cal->v1Calibration().TSN, String(8, u'\0'));  // only blanks are trimmed
-  EXPECT_EQ(cal->ID().get<String>(), String(8, u'\0'));
-  EXPECT_EQ(cal->DateCreated().get<Date>(), Date{0.0});
-  EXPECT_EQ(cal->TempCalibrated(), 0.0f);
-  EXPECT_EQ(cal->StreamLen(), 4188);
-  const ByteArray bytes = block_of(*cal);
-  EXPECT_EQ(bytes.ubound(), 4188);
-  EXPECT_EQ(slice(bytes, 0, 4189), Bytes(4189, 0));
-}
-
 TEST(KVCalibration, TsnIsEightUnitsCutOrPadded) {
   auto cal = KVCalibration::create();
   cal->TSN(u"1234567890");
@@ -75,30 +57,6 @@ TEST(KVCalibration, TsnIsEightUnitsCutOrPadded) {
   EXPECT_EQ(cal->ID().get<String>(), u"AB      ");
   EXPECT_EQ(cal->v1Calibration().TSN, u"AB");
   EXPECT_EQ(cal->TSN(), u"AB      ");  // the get above trims a copy only
-}
-
-TEST(KVCalibration, BlockLayout) {
-  auto cal = KVCalibration::create();
-  cal->TSN(u"AB");
-  cal->DateCertified(Date{45000.5});
-  cal->TempCalibrated(23.5f);
-  cal->Tiles(1)->SCWL(eSC::SCE, 1, 1.0);
-  cal->Tiles(13)->SCWL(eSC::SCI, 40, 87.5);
-  cal->Tiles(2)->SCWL(eSC::SCI, 1, -2.5);
-
-  const ByteArray bytes = block_of(*cal);
-  EXPECT_EQ(slice(bytes, 0, 32), cat({
-                                     {0x41, 0x00, 0x42, 0x00},                          // "AB"
-                                     units(0x20, 0x00, 6),                              // padding
-                                     {0x00, 0x00, 0x00, 0x00, 0x10, 0xF9, 0xE5, 0x40},  // date
-                                     {0x00, 0x00, 0xBC, 0x41},                          // 23.5
-                                     {0x00, 0x00, 0x80, 0x3F},  // tile 1 SCE band 1
-                                 }));
-  // Tile 2 SCI band 1 at 28 + 320 + 160.
-  EXPECT_EQ(slice(bytes, 504, 8), (Bytes{0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0x20, 0xC0}));
-  // Tile 13 SCI band 40 at 28 + 320 x 12 + 160 + 39 x 4, the block's last value.
-  EXPECT_EQ(slice(bytes, 4180, 9), (Bytes{0, 0, 0, 0, 0x00, 0x00, 0xAF, 0x42, 0}));
-  EXPECT_EQ(cal->DateCreated().get<Date>(), Date{45000.5});
 }
 
 TEST(KVCalibration, TilesAreWrittenBackAtTheirOrder) {
@@ -176,41 +134,6 @@ TEST(KVCalibration, CalibrationErrors) {
   EXPECT_EQ(after.TempCalibrated, -4.0f);
   EXPECT_EQ(after.Tiles(12), shifted.Tiles(12));
   EXPECT_EQ(after.Tiles(13), filled_record().Tiles(13));
-}
-
-TEST(KVCalibration, StreamInReadsTheWholeBlockOrNothing) {
-  auto source = KVCalibration::create();
-  source->v1Calibration(filled_record());
-  const ByteArray image = block_of(*source);
-  const Bytes block = slice(image, 0, 4188);
-
-  // Exactly 4188 bytes, from a stream that starts at index 1.
-  auto cal = KVCalibration::create();
-  ByteArray exact = stream_of(block, 1);
-  Long position = 1;
-  ASSERT_TRUE(cal->StreamIn(exact, position));
-  EXPECT_EQ(position, 4189);
-  EXPECT_EQ(cal->v1Calibration(), filled_record());
-  EXPECT_EQ(cal->TSN(), u"TS-042  ");
-}
-
-TEST(KVCalibration, StreamOutRoundTrip) {
-  auto cal = KVCalibration::create();
-  cal->v1Calibration(filled_record());
-  ByteArray bytes = stream_of(Bytes(10, 0xAA), 1);  // a stream loaded from a file
-  Long position = 3;
-  ASSERT_TRUE(cal->StreamOut(bytes, position));
-  EXPECT_EQ(position, 3 + 4188);
-  EXPECT_EQ(bytes.lbound(), 0);
-  EXPECT_EQ(bytes.ubound(), position);
-  EXPECT_EQ(slice(bytes, 0, 3), (Bytes{0x00, 0xAA, 0xAA}));
-
-  auto copy = KVCalibration::create();
-  Long read = 3;
-  ASSERT_TRUE(copy->StreamIn(bytes, read));
-  EXPECT_EQ(read, position);
-  EXPECT_EQ(copy->v1Calibration(), cal->v1Calibration());
-  EXPECT_EQ(copy->TSN(), cal->TSN());
 }
 
 TEST(KVCalibration, TilesKeepTheirCalibrationAlive) {

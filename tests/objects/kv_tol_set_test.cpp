@@ -2,29 +2,13 @@
 
 #include <gtest/gtest.h>
 
-#include <limits>
 #include <vector>
 
 #include "kvdata/automation/create_object.hpp"
 #include "kvdata/automation/error.hpp"
-#include "objects/expected_bytes.hpp"
 
+namespace kvdata {
 namespace {
-
-using kvdata::ByteArray;
-using kvdata::Date;
-using kvdata::Double;
-using kvdata::IKVDBObject;
-using kvdata::IKVObj;
-using kvdata::IKVSecurity;
-using kvdata::IKVStream;
-using kvdata::IKVTolerance;
-using kvdata::IKVTolSet;
-using kvdata::KVTolerance;
-using kvdata::KVTolSet;
-using kvdata::Long;
-using kvdata::String;
-using kvdata::Variant;
 
 std::shared_ptr<KVTolerance> tolerance(Long id, const String& name = {}) {
   auto tol = KVTolerance::create();
@@ -52,73 +36,6 @@ std::shared_ptr<KVTolSet> two_member_set() {
   s.Add(tolerance(5, u"A"), u"5");
   s.Add(tolerance(9, u"B"), u"9");
   return set;
-}
-
-TEST(KVTolSet, StreamIsTheHeaderThenEachMember) {
-  const std::vector<kvdata::Byte> image = ImageFromData("tolerance set");
-  ASSERT_EQ(image.size(), 2031u);
-
-  auto set = two_member_set();
-  ByteArray bytes(0, -1);
-  Long pos = 0;
-  ASSERT_TRUE(set->StreamOut(bytes, pos));
-  EXPECT_EQ(pos, 2031);
-  EXPECT_EQ(bytes.lbound(), 0);
-  EXPECT_EQ(bytes.ubound(), 2031);
-  EXPECT_TRUE(HoldsAt(bytes, 0, image));
-  EXPECT_EQ(set->StreamLen(), 532 + 2 * 748);
-
-  // Keys come back from the members' IDs, in stream order.
-  auto back = KVTolSet::create();
-  pos = 0;
-  ASSERT_TRUE(back->StreamIn(bytes, pos));
-  EXPECT_EQ(pos, 2031);
-  IKVTolSet& b = *back;
-  EXPECT_EQ(b.count(), 2);
-  EXPECT_EQ(member_ids(*back), (std::vector<Long>{5, 9}));
-  EXPECT_EQ(b.Item(Variant(u"9"))->TolName(), u"B");
-  EXPECT_EQ(b.ID(), 7);
-  EXPECT_EQ(b.InstTypeID(), 3);
-  EXPECT_EQ(b.CreateDate(), Date{2.0});
-  EXPECT_EQ(b.Description(), Variant(u"Set"));
-
-  // An empty set: the header alone, one spare element after it.
-  auto empty = KVTolSet::create();
-  ByteArray alone;
-  pos = 0;
-  ASSERT_TRUE(empty->StreamOut(alone, pos));
-  EXPECT_EQ(pos, 533);
-  EXPECT_EQ(alone.ubound(), 533);
-  EXPECT_TRUE(HoldsAt(alone, 528, {0x00, 0x00, 0x00, 0x00, 0x00, 0x00}));
-  EXPECT_EQ(empty->StreamLen(), 532);
-}
-
-TEST(KVTolSet, StreamOutSetsTheArrayToItsOwnEnd) {
-  // A longer array is cut to the final Position; what precedes the set stays.
-  ByteArray longer(0, 4999);
-  for (auto& b : longer) b = 0xEE;
-  Long pos = 3;
-  ASSERT_TRUE(two_member_set()->StreamOut(longer, pos));
-  EXPECT_EQ(pos, 2034);
-  EXPECT_EQ(longer.ubound(), 2034);
-  EXPECT_TRUE(HoldsAt(longer, 0, {0xEE, 0xEE, 0xEE, 0x07}));
-
-  // A Position below 0 fails before the array is touched.
-  ByteArray kept(0, 9);
-  pos = -1;
-  EXPECT_FALSE(two_member_set()->StreamOut(kept, pos));
-  EXPECT_EQ(pos, -1);
-  EXPECT_EQ(kept.ubound(), 9);
-
-  // A Position whose header would pass the Long range fails the same way.
-  pos = std::numeric_limits<Long>::max() - 100;
-  EXPECT_FALSE(two_member_set()->StreamOut(kept, pos));
-  EXPECT_EQ(kept.ubound(), 9);
-
-  // An array never given bounds counts as empty.
-  ByteArray unbounded;
-  EXPECT_TRUE(two_member_set()->StreamOut(unbounded));
-  EXPECT_EQ(unbounded.ubound(), 2031);
 }
 
 TEST(KVTolSet, ItemLooksUpTextKeysNeverPositions) {
@@ -223,3 +140,4 @@ TEST(KVTolSet, IdentityIsTheInstrumentType) {
 }
 
 }  // namespace
+}  // namespace kvdata

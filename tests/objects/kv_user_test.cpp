@@ -3,22 +3,11 @@
 #include <gtest/gtest.h>
 
 #include <limits>
-#include <vector>
 
-#include "kvdata/automation/create_object.hpp"
-#include "kvdata/automation/event_log.hpp"
-#include "kvdata/foundation/ikv_db_object.hpp"
-#include "kvdata/foundation/ikv_security.hpp"
-#include "objects/expected_bytes.hpp"
 #include "support/streams.hpp"
 
+namespace kvdata {
 namespace {
-
-using kvdata::ByteArray;
-using kvdata::KVUser;
-using kvdata::Long;
-using kvdata::String;
-using kvdata::tUser;
 
 tUser sample_user() {
   tUser u;
@@ -32,11 +21,6 @@ tUser sample_user() {
   return u;  // RoleCode and Disabled empty
 }
 
-// The 848 bytes of sample_user().
-std::vector<kvdata::Byte> sample_image() {
-  return ImageFromData("user");
-}
-
 std::shared_ptr<KVUser> sample() {
   auto user = KVUser::create();
   user->v1User(sample_user());
@@ -45,18 +29,11 @@ std::shared_ptr<KVUser> sample() {
 
 using kvdata::testing::LogCapture;
 
-TEST(KVUser, StreamIsTheStampAndTheBlockWithOneSpareByte) {
-  const auto expected = sample_image();
-  ASSERT_EQ(expected.size(), 848u);
-
-  ByteArray bytes(0, -1);
+// Texts read back without their padding (the image: images_test.cpp).
+TEST(KVUser, StreamedTextsComeBackTrimmed) {
+  ByteArray bytes;
+  ASSERT_TRUE(sample()->StreamOut(bytes));
   Long pos = 0;
-  ASSERT_TRUE(sample()->StreamOut(bytes, pos));
-  EXPECT_EQ(pos, 848);
-  EXPECT_EQ(bytes.lbound(), 0);
-  EXPECT_EQ(bytes.ubound(), 848);
-  EXPECT_TRUE(HoldsAt(bytes, 0, expected));
-  EXPECT_EQ(bytes(848), 0);
 
   auto back = KVUser::create();
   pos = 0;
@@ -107,43 +84,5 @@ TEST(KVUser, RefusedPositionsLeaveTheirText) {
   EXPECT_EQ(user->ErrMsg(), u"Overflow");
 }
 
-// Short streams, other stamps and Positions outside the stream: bad_input_test.cpp.
-TEST(KVUser, StreamInFromAnotherLowerBound) {
-  ByteArray good;
-  ASSERT_TRUE(sample()->StreamOut(good));
-  auto user = KVUser::create();
-  // A stream loaded from a file starts at index 1. Read from index 0, its
-  // stamp cannot be read at all: one log entry, the stamp counts as 0, and
-  // Position stays.
-  ByteArray from_file(1, 849);
-  for (Long i = 1; i <= 849; ++i) from_file(i) = good(i - 1);
-  {
-    LogCapture log;
-    Long pos = 0;
-    EXPECT_FALSE(user->StreamIn(from_file, pos));
-    EXPECT_EQ(pos, 0);
-    EXPECT_EQ(log.entries.size(), 1u);
-    EXPECT_EQ(user->ErrMsg(), u"Client and Server KVData.DLL versions don't match");
-  }
-  Long pos = 1;
-  EXPECT_TRUE(user->StreamIn(from_file, pos));
-  EXPECT_EQ(pos, 849);
-  EXPECT_EQ(user->v1User().USERID, u"ABCD");
-
-  // An array without bounds fails on asking for them.
-  EXPECT_FALSE(user->StreamIn(ByteArray()));
-  EXPECT_EQ(user->ErrMsg(), u"Subscript out of range");
-}
-
-TEST(KVUser, IdentityAndRecordCopies) {
-  auto user = KVUser::create();
-  EXPECT_TRUE(user->ID().is_empty());
-  EXPECT_TRUE(user->DateCreated().is_empty());
-  EXPECT_EQ(user->StreamLen(), 848);
-  tUser record = sample_user();
-  user->v1User(record);
-  record.USERID = u"CHANGED";
-  EXPECT_EQ(user->v1User().USERID, u"ABCD");
-}
-
 }  // namespace
+}  // namespace kvdata

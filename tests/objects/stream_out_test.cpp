@@ -24,7 +24,7 @@ constexpr Long kLongMin = std::numeric_limits<Long>::min();
 
 std::shared_ptr<IKVStream> profile() {
   auto p = KVProfile::create();
-  p->ISN(u"SN-7");
+  p->ISN(u"SN-\u20AC");  // one byte in the stream
   return p;
 }
 std::shared_ptr<IKVStream> test_run(Long tiles) {
@@ -41,6 +41,12 @@ std::shared_ptr<IKVStream> tolerance() {
   t->ID(5);
   t->TolName(u"dE");
   return t;
+}
+std::shared_ptr<IKVStream> tol_set() {
+  auto s = KVTolSet::create();
+  s->Add(query<IKVTolerance>(tolerance()), u"5");
+  s->Add(KVTolerance::create(), u"0");
+  return s;
 }
 std::shared_ptr<IKVStream> tile_set() {
   auto s = KVTileSet::create();
@@ -79,6 +85,7 @@ const std::vector<Case>& cases() {
       // an encoding longer than the working room grows the array past it
       {"test run of 40 tiles", [] { return test_run(40); }, false, false, kLongMax - 19999, false},
       {"tolerance", tolerance, true, true, kLongMax - 100, true, 1},
+      {"tolerance set", tol_set, false, false, kLongMax - 100, false, 3},
       {"user", user, false, false, kLongMax - 847},
       {"tile", tile, false, false, kLongMax - 100},
       {"tile set", tile_set, false, false, kLongMax - 100},

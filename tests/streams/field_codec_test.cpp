@@ -7,7 +7,6 @@
 #include <vector>
 
 #include "kvdata/kvdata.hpp"
-#include "streams/detail/checked_codec.hpp"
 #include "streams/stream_test_support.hpp"
 
 namespace kvdata {
@@ -84,19 +83,6 @@ TEST(FieldCodec, EachTypeWritesAndReadsItsLittleEndianImage) {
   EXPECT_EQ(contents(all), images);
   EXPECT_EQ(end, static_cast<Long>(images.size()));
   EXPECT_TRUE(log.entries.empty());
-}
-
-TEST(FieldCodec, OnlyTheByteOneReadsAsTrue) {
-  const ByteArray stream = stream_of({0x00, 0x01, 0x02, 0xFF, 0x80});
-  Long pos = 0;
-  std::vector<bool> seen;
-  for (int k = 0; k < 5; ++k) {
-    bool b = true;
-    BooleanFromArray(stream, pos, b);
-    seen.push_back(b);
-  }
-  EXPECT_EQ(seen, (std::vector<bool>{false, true, false, false, false}));
-  EXPECT_EQ(pos, 5);
 }
 
 TEST(FieldCodec, WritersGrowToTheExactEndAndKeepTheLowerBound) {
@@ -306,31 +292,6 @@ TEST(FieldCodec, StringWriterFailures) {
   EXPECT_EQ(log.entries[1],
             u"Calling LongToArray - (StringToArray, VIZuvuvadiRoruzu)\r\n"
             u"Error in SUB StringToArray - Value = abcdefghij. 6-Overflow. (KVData).");
-}
-
-TEST(FieldCodec, CheckedVariantsReportWhatThePublicOnesOnlyLog) {
-  LogCapture log;
-  ByteArray stream(0, -1);
-  Long pos = 0;
-  EXPECT_TRUE(checked::write_string(u"hi", stream, pos));
-  EXPECT_TRUE(checked::write_boolean(true, stream, pos));
-  ByteArray none;
-  Long zero = 0;
-  EXPECT_FALSE(checked::write_single(1.0f, none, zero));
-  EXPECT_EQ(log.entries.size(), 1u);
-
-  pos = 0;
-  String s;
-  bool b = false;
-  Long l = 0;
-  EXPECT_TRUE(checked::read_string(stream, pos, s));
-  EXPECT_TRUE(checked::read_boolean(stream, pos, b));
-  EXPECT_FALSE(checked::read_long(stream, pos, l));
-  s = u"x";
-  EXPECT_FALSE(checked::read_string(stream, pos, s));  // no count left
-  EXPECT_EQ(s, u"");
-  EXPECT_EQ(log.entries.size(), 3u);
-  EXPECT_EQ(pos, 7);
 }
 
 }  // namespace

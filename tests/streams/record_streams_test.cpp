@@ -1,6 +1,5 @@
 #include <gtest/gtest.h>
 
-#include <string>
 #include <vector>
 
 #include "kvdata/kvdata.hpp"
@@ -25,13 +24,6 @@ constexpr auto kFrom = eStreamDirection::FromStream;
 
 Streams& streams() {
   return Streams::instance();
-}
-
-TEST(Streams, IsCreatableAndHasOnePredeclaredInstance) {
-  auto created = query<Streams>(CreateObject(u"KVData.Streams"));
-  ASSERT_NE(created, nullptr);
-  EXPECT_NE(created.get(), &Streams::instance());
-  EXPECT_EQ(&Streams::instance(), &Streams::instance());
 }
 
 TEST(Streams, AnyOtherDirectionDoesNothing) {
@@ -93,34 +85,6 @@ TEST(Streams, SCPairWriterGrowsTheStreamAsItsValuesOneByOneWould) {
   want.insert(want.end(), expected.bytes.begin(), expected.bytes.end());
   EXPECT_EQ(contents(loaded), want);
   EXPECT_TRUE(log.entries.empty());
-
-  // A Position below the lower bound: the first value fails, logs its one
-  // entry, and nothing is written.
-  pos = 0;
-  EXPECT_FALSE(streams().Stream_SCPair(kTo, loaded, pos, copy));
-  EXPECT_EQ(pos, 0);
-  EXPECT_EQ(contents(loaded), want);
-  ASSERT_EQ(log.entries.size(), 1u);
-  EXPECT_EQ(log.entries[0].rfind(u"Error in SUB SingleToArray - Value = 3.25. 9-", 0), 0u)
-      << to_utf8(log.entries[0]);
-}
-
-TEST(Streams, SCPairReaderStopsAtTheFirstMissingValue) {
-  LogCapture log;
-  Wire w;
-  for (int j = 1; j <= 10; ++j) w.f32(static_cast<float>(-j));
-  ByteArray stream = stream_of(w.raw({1, 2}).bytes);
-  tSCPair pair = sc_pair(5);
-  Long pos = 0;
-  EXPECT_FALSE(streams().Stream_SCPair(kFrom, stream, pos, pair));
-  // The values read are stored, the rest keep what they held.
-  EXPECT_EQ(pair.Spectrum(eSC::SCE).Data(10), -10.0f);
-  EXPECT_EQ(pair.Spectrum(eSC::SCE).Data(11), sc_pair(5).Spectrum(eSC::SCE).Data(11));
-  EXPECT_EQ(pair.Spectrum(eSC::SCI), sc_pair(5).Spectrum(eSC::SCI));
-  EXPECT_EQ(pos, 40);
-  ASSERT_EQ(log.entries.size(), 1u);
-  EXPECT_EQ(log.entries[0],
-            u"Error in SUB SingleFromArray - Value = 0. 9-Subscript out of range. (KVData).");
 }
 
 TEST(Streams, StationIsThreeStrings) {
@@ -227,30 +191,6 @@ TEST(Streams, TileSetWriterRefusesBeforeWritingAnything) {
   EXPECT_TRUE(streams().Stream_TileSetCalibration(kTo, stream, pos, largest, largest_calibration));
 }
 
-TEST(Streams, TileSetReaderRefusesShortStreams) {
-  // A stream cut anywhere reads back False, one entry at most, records unchanged.
-  LogCapture log;
-  tTileSet ts = tile_set(0, 1);
-  tTileSetCalibration tsc = calibration(0, 1);
-  ByteArray full(0, -1);
-  Long pos = 0;
-  ASSERT_TRUE(streams().Stream_TileSetCalibration(kTo, full, pos, ts, tsc));
-  const Bytes bytes = contents(full);
-  const tTileSet ts_before = tile_set(0, 2, u"old");
-  const tTileSetCalibration tsc_before = calibration(0, 2, u"old");
-  for (std::size_t cut = 0; cut < bytes.size(); ++cut) {
-    log.entries.clear();
-    ts = ts_before;
-    tsc = tsc_before;
-    ByteArray stream = stream_of(Bytes(bytes.begin(), bytes.begin() + static_cast<long>(cut)));
-    pos = 0;
-    EXPECT_FALSE(streams().Stream_TileSetCalibration(kFrom, stream, pos, ts, tsc)) << cut;
-    EXPECT_EQ(ts, ts_before) << cut;
-    EXPECT_EQ(tsc, tsc_before) << cut;
-    EXPECT_LE(log.entries.size(), 1u) << cut;
-  }
-}
-
 // --- Profile ----------------------------------------------------------------
 
 TEST(Streams, ProfileCarriesItsTypeNameAndInterleavedTables) {
@@ -281,55 +221,6 @@ TEST(Streams, ProfileWriterNeedsItsTables) {
   EXPECT_FALSE(streams().Stream_Profile(kTo, stream, pos, pro));
   EXPECT_EQ(stream.ubound(), -1);
   EXPECT_EQ(pos, 0);
-}
-
-// Every writer's output reads back to an equal record, one record after
-// another in one stream, here in a stream loaded with lower bound 1 (the
-// round trip of each record).
-TEST(Streams, EveryRecordReadsBackFromOneSharedStream) {
-  LogCapture log;
-  tSCPair pair = sc_pair(3);
-  tTileSet ts = tile_set(1, 13);
-  tTileSetCalibration tsc = calibration(1, 13);
-  tOVProfile pro = profile();
-  tStation st{u"{S}", u"Station \u00e9", u"s@x"};
-  tUser user{u"id", 5, u"Last", u"First", u"pwd", u"m@x", 9, u"R", u""};
-  tOrganization org{3, u"Org", 2, 1, u"O", u"Y"};
-  ByteArray stream(1, 1);
-  Long pos = 1;
-  ASSERT_TRUE(streams().Stream_SCPair(kTo, stream, pos, pair));
-  ASSERT_TRUE(streams().Stream_TileSetCalibration(kTo, stream, pos, ts, tsc));
-  ASSERT_TRUE(streams().Stream_Profile(kTo, stream, pos, pro));
-  ASSERT_TRUE(streams().Stream_Station(kTo, stream, pos, st));
-  stream.redim_preserve(1, pos + 261 + 133 - 1);  // blocks need their room
-  ASSERT_TRUE(streams().Stream_User(kTo, stream, pos, user));
-  ASSERT_TRUE(streams().Stream_Organization(kTo, stream, pos, org));
-  EXPECT_EQ(pos, stream.ubound() + 1);
-
-  tSCPair pair_back;
-  tTileSet ts_back;
-  tTileSetCalibration tsc_back;
-  tOVProfile pro_back;
-  tStation st_back;
-  tUser user_back;
-  tOrganization org_back;
-  pos = 1;
-  ASSERT_TRUE(streams().Stream_SCPair(kFrom, stream, pos, pair_back));
-  ASSERT_TRUE(streams().Stream_TileSetCalibration(kFrom, stream, pos, ts_back, tsc_back));
-  ASSERT_TRUE(streams().Stream_Profile(kFrom, stream, pos, pro_back));
-  ASSERT_TRUE(streams().Stream_Station(kFrom, stream, pos, st_back));
-  ASSERT_TRUE(streams().Stream_User(kFrom, stream, pos, user_back));
-  ASSERT_TRUE(streams().Stream_Organization(kFrom, stream, pos, org_back));
-  EXPECT_EQ(pair_back, pair);
-  EXPECT_EQ(ts_back, ts);
-  EXPECT_EQ(tsc_back, tsc);
-  EXPECT_EQ(pro_back, pro);
-  EXPECT_EQ(st_back, st);
-  user.Disabled = String(1, u'\0');
-  EXPECT_EQ(user_back, user);
-  EXPECT_EQ(org_back, org);
-  EXPECT_EQ(pos, stream.ubound() + 1);
-  EXPECT_TRUE(log.entries.empty());
 }
 
 }  // namespace

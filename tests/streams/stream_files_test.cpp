@@ -71,10 +71,13 @@ TEST_F(StreamFiles, SavedBytesLoadBackWithLowerBoundOne) {
   // Whatever the lower bound, only the elements are written.
   ASSERT_TRUE(streams().StreamSave(name_of(path("t.bin")), stream_of({7, 8}, -5)));
   EXPECT_EQ(file_bytes(path("t.bin")), (Bytes{7, 8}));
-  // A name near the length limit still gets its temporary file.
+  // A name near the length limit still gets its temporary file; a name
+  // beyond ASCII (U+00A9, two bytes in UTF-8) names the same file.
   ASSERT_TRUE(streams().StreamSave(name_of(path(std::string(250, 'n'))), a));
   EXPECT_EQ(file_bytes(path(std::string(250, 'n'))), ten);
-  EXPECT_EQ(entries_in_dir(), 3u);  // no temporary file left beside them
+  ASSERT_TRUE(streams().StreamSave(name_of(path("s\xC2\xA9.bin")), a));
+  EXPECT_EQ(file_bytes(path("s\xC2\xA9.bin")), ten);
+  EXPECT_EQ(entries_in_dir(), 4u);  // no temporary file left beside them
 }
 
 TEST_F(StreamFiles, SavingReplacesALongerFileWhole) {

@@ -3,15 +3,6 @@
 // every field, their expected images, and the largest allocation made while a
 // piece of code runs. Byte builders and log capture: support/streams.hpp.
 
-#include <algorithm>
-#include <bit>
-#include <cstddef>
-#include <cstdint>
-#include <initializer_list>
-#include <string>
-#include <string_view>
-#include <vector>
-
 #include "kvdata/kvdata.hpp"
 #include "support/streams.hpp"
 

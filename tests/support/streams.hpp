@@ -60,17 +60,8 @@ struct Wire {
     for (char c : text) bytes.push_back(static_cast<Byte>(c));
     return *this;
   }
-  // UTF-16 code units, little-endian.
-  Wire& units(std::u16string_view text) {
-    for (char16_t c : text) le(c, 2);
-    return *this;
-  }
   Wire& zeros(std::size_t n) {
     bytes.insert(bytes.end(), n, Byte{0});
-    return *this;
-  }
-  Wire& append(const Bytes& more) {
-    bytes.insert(bytes.end(), more.begin(), more.end());
     return *this;
   }
   std::size_t size() const { return bytes.size(); }
