@@ -35,11 +35,6 @@ run() {
 mode() { stat -c %a "$1"; }
 type_of() { stat -c %F "$1"; }
 no_temporary() { ! ls -A | grep -q '^\.kvdata-'; }
-# Waits (up to 2 s) for the reader of the FIFO case to have read everything.
-reader_done() {
-  for _ in $(seq 200); do kill -0 "$(cat reader)" 2>/dev/null || return 0; sleep 0.01; done
-  return 1
-}
 
 cp "$examples/streams/user.kvs" user.kvs
 cp "$examples/json/user.json" user.json
