@@ -11,6 +11,7 @@
 #include "kvdata/automation/text.hpp"
 #include "kvdata/foundation/record_fields.hpp"
 #include "support/library_log.hpp"
+#include "wire/codec.hpp"
 
 namespace kvdata::cli {
 namespace {
@@ -21,11 +22,6 @@ struct Overloaded : F... {
 };
 template <class... F>
 Overloaded(F...) -> Overloaded<F...>;
-
-std::span<const Byte> whole(const ByteArray& bytes) {
-  if (!bytes.has_bounds()) return {};
-  return {bytes.data(), bytes.size()};
-}
 
 // Shortest text that reads back, or the JSON form of a value JSON cannot hold.
 std::string show_single(Single v) {
@@ -206,7 +202,7 @@ std::string value_text(const StreamField& f, std::span<const Byte> stream) {
 }
 
 WalkEnd explain_table(StreamKind kind, const ByteArray& bytes, std::size_t size, OutputFile& out) {
-  const std::span<const Byte> stream = whole(bytes);
+  const std::span<const Byte> stream = bytes_of(bytes);
   LongestPath longest;
   {
     const LibraryLog drop;  // the walk below keeps them
@@ -241,7 +237,7 @@ WalkEnd explain_table(StreamKind kind, const ByteArray& bytes, std::size_t size,
 }
 
 WalkEnd explain_json(StreamKind kind, const ByteArray& bytes, std::size_t size, OutputFile& out) {
-  const std::span<const Byte> stream = whole(bytes);
+  const std::span<const Byte> stream = bytes_of(bytes);
   out.write("{\n  \"kind\": " + Json(std::string(kind_name(kind))).dump() +
             ",\n  \"size\": " + std::to_string(size) + ",\n  \"fields\": [");
   JsonRows rows(stream, out);
